@@ -1,0 +1,14 @@
+# Compile options shared by every project target. Third-party code never sees
+# these; project targets opt in by linking nlssm_project_options.
+add_library(nlssm_project_options INTERFACE)
+target_compile_options(nlssm_project_options INTERFACE
+  -Wall -Wextra -Werror
+  $<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor>)
+
+# Sanitizer builds: the flags come from the preset so that every target,
+# including tests and the host, is instrumented the same way.
+set(NLSSM_SANITIZE "" CACHE STRING "Sanitizers to build with: address,undefined | thread | fuzzer")
+if(NLSSM_SANITIZE)
+  add_compile_options(-fsanitize=${NLSSM_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all)
+  add_link_options(-fsanitize=${NLSSM_SANITIZE})
+endif()

@@ -1,0 +1,519 @@
+/* nlssm: national-language string operations on text in its own encoding.
+ *
+ * The C interface of the module: status codes, special positions, the NLSSM
+ * handle and its operation table, the string descriptor, the module object,
+ * the version record, and every exported function. Usable from C99 and C++.
+ */
+#ifndef NLSSM_NLSSM_H
+#define NLSSM_NLSSM_H
+
+#include <stddef.h>
+#include <stdint.h>
+
+#if defined(__cplusplus)
+#define NLSSM_EXTERN_C extern "C"
+#define NLSSM_DATA_EXTERN extern "C"
+#define NLSSM_STATIC_ASSERT(cond, msg) static_assert(cond, msg)
+#else
+#define NLSSM_EXTERN_C
+#define NLSSM_DATA_EXTERN extern
+#define NLSSM_STATIC_ASSERT(cond, msg) _Static_assert(cond, msg)
+#endif
+
+#define NLSSM_API NLSSM_EXTERN_C __attribute__((visibility("default")))
+#define NLSSM_DATA_API NLSSM_DATA_EXTERN __attribute__((visibility("default")))
+
+/* ---- Results ----------------------------------------------------------
+ * Transforming operations return a 32-bit status in a 64-bit result,
+ * zero-extended: compare the result with these constants. */
+#define NLSSM_OK 0x0u
+#define NLSSM_E_NO_MEMORY 0x803fc002u          /* pool, allocation, locale, table, converter */
+#define NLSSM_E_UNSUPPORTED 0x803fc004u        /* operation not supported */
+#define NLSSM_E_DEST_TOO_SMALL 0x803fe807u     /* what fits was written, no padding */
+#define NLSSM_E_ILL_FORMED 0x803fe808u         /* invalid UTF lead byte or lone surrogate */
+#define NLSSM_E_ENCODING 0x803fe809u           /* encoding not supported */
+#define NLSSM_E_NUMBER_DOES_NOT_FIT 0x803fe80eu /* field filled with '*' */
+#define NLSSM_E_NOT_A_NUMBER 0x803fe810u
+#define NLSSM_E_INT_OVERFLOW 0x803fe811u
+#define NLSSM_E_TRUNCATED_SEQUENCE 0x803fe814u /* input ends inside a sequence */
+#define NLSSM_E_NUMBER_TOO_LONG 0x803fe818u    /* over 152 bytes, or negative capacity */
+#define NLSSM_E_NULL_ARGUMENT 0x803fe82au
+#define NLSSM_E_BAD_CHARACTER 0x803fe82cu      /* malformed or truncated multi-byte character */
+#define NLSSM_E_BAD_OPTIONS 0x803fe82eu
+#define NLSSM_E_BAD_ARGUMENT 0x803fe82fu       /* non-null reserved argument to NLSSMCreate */
+#define NLSSM_E_BAD_ALIGNMENT 0x803fe835u      /* justify alignment code */
+/* Counting operations report a failed work-buffer allocation with this. */
+#define NLSSM_COUNT_NO_MEMORY INT64_MIN
+
+/* ---- Special positions -------------------------------------------------- */
+#define NLSSM_POS_NONE (-9)         /* no current or next character */
+#define NLSSM_POS_NO_PREVIOUS (-1)  /* no previous character */
+#define NLSSM_POS_OUTSIDE (-99)     /* stringSetPos target outside the string */
+#define NLSSM_POS_CURRENT (-999)    /* stringSetPos argument: the current character */
+#define NLSSM_POS_LAST (-199)       /* stringSetPos argument: the last character */
+#define NLSSM_SIZE_NONE (-10)       /* stringCurCharSize with no current character */
+
+/* ---- Encoding classes and character kinds -------------------------------- */
+#define NLSSM_CLASS_SBCS 0
+#define NLSSM_CLASS_UTF8 1 /* UTF-8 and UTF-EBCDIC */
+#define NLSSM_CLASS_WCS2 2
+#define NLSSM_CLASS_WCS4 3
+#define NLSSM_CLASS_MBCS_MODAL 4
+#define NLSSM_CLASS_MBCS_NONMODAL 5
+
+#define NLSSM_KIND_SINGLE 1u
+#define NLSSM_KIND_DOUBLE 4u
+#define NLSSM_KIND_THREE 12u
+#define NLSSM_KIND_FOUR 13u
+
+/* Encoding numbers with a fixed meaning. */
+#define NLSSM_ENC_UTF8 20
+#define NLSSM_ENC_WCS2_BE 24
+#define NLSSM_ENC_WCS2_LE 25
+#define NLSSM_ENC_WCS4_BE 26
+#define NLSSM_ENC_HOST_CHARS 27 /* the host's own character form */
+#define NLSSM_ENC_REFERENCE_SBCS 62
+#define NLSSM_ENC_EUC_JP 134
+#define NLSSM_ENC_GB18030 205
+#define NLSSM_ENCODING_LIMIT 265
+
+/* Option bits shared by the comparison and case families. */
+#define NLSSM_OPT_PAD 0x1u
+#define NLSSM_OPT_FOLD_LOWER 0x2u
+#define NLSSM_OPT_FOLD_UPPER 0x4u
+/* Editing flags. */
+#define NLSSM_EDIT_PAD 0x1u
+#define NLSSM_EDIT_SOURCE_IN_CHARS 0x200u
+
+/* ---- String descriptor ----------------------------------------------------- */
+typedef struct NLSString {
+  uint8_t *buffer;     /* base of the byte buffer */
+  uint64_t length;     /* used bytes: offset of the end of the text */
+  uint64_t capacity;   /* buffer size in bytes */
+  int64_t charIndex;   /* 0-based index of the current character */
+  int64_t curOffset;   /* byte offset of the current character, or -9 */
+  int64_t nextOffset;  /* byte offset of the next character, or -9 */
+  int64_t prevOffset;  /* byte offset of the previous character, or -1 */
+  uint32_t charKind;   /* multi-byte classes: 1, 4, 12 or 13 */
+  uint32_t nextCharKind;
+  uint32_t prevKind;
+} NLSString;
+
+/* One character with its own inline storage, built by NLSCharInit. */
+typedef struct NLSChar {
+  NLSString string;
+  uint64_t charBytes;
+  uint8_t bytes[4];
+} NLSChar;
+
+/* ---- The NLSSM handle -------------------------------------------------------
+ * 177 64-bit words; per-encoding data and operation slots interleave. A slot
+ * holds a function whose first argument is the handle; callers cast it to
+ * the operation's prototype (declared below under the member names). */
+typedef void (*NLSSlot)(void);
+
+typedef struct NLSSMHandle {
+  char magic[8]; /* "nevo" */
+  const char *name; /* "QVNLSSM handle" */
+  NLSSlot destroy; /* NLSSMDestroy */
+  void *owner; /* host NLS object that built the handle */
+  uint32_t encodingNumber; uint32_t unitWidth; /* 4 */
+  uint32_t encodingClass; uint32_t reserved5; /* 5 */
+  NLSSlot NLSNumChars; /* 6 */
+  NLSSlot NLSBlankPad; /* 7 */
+  NLSSlot NLSAllBlanks; /* 8 */
+  NLSSlot NLSStringIndex; /* 9 */
+  NLSSlot NLSStringEquals; /* 10 */
+  NLSSlot NLSStringLower; /* 11 */
+  NLSSlot NLSStringUpper; /* 12 */
+  NLSSlot NLSStringNormalize; /* 13 */
+  NLSSlot NLSStringInit; /* 14 */
+  NLSSlot NLSCharInit; /* 15 */
+  NLSSlot NLSStringClean; /* 16 */
+  NLSSlot stringDupPos; /* 17 */
+  NLSSlot stringGetPos; /* 18 */
+  NLSSlot stringSetPos; /* 19 */
+  NLSSlot stringNextChar; /* 20 */
+  NLSSlot stringNextCharB; /* 21 */
+  NLSSlot reserved22; /* 22 */
+  NLSSlot NLSStringCompLit; /* 23 */
+  NLSSlot NLSStringCompStr; /* 24 */
+  NLSSlot NLSStringCompare; /* 25 */
+  NLSSlot stringCurCharSize; /* 26 */
+  NLSSlot NLSStringLike; /* 27 */
+  NLSSlot NLSStringContains; /* 28 */
+  NLSSlot NLSStringFromDouble; /* 29 */
+  NLSSlot NLSStringFromIntmax; /* 30 */
+  NLSSlot NLSStringToDouble; /* 31 */
+  NLSSlot NLSStringToIntmax; /* 32 */
+  NLSSlot NLSStringReverse; /* 33 */
+  NLSSlot NLSStringDelete; /* 34 */
+  NLSSlot NLSStringDeleteLit; /* 35 */
+  NLSSlot NLSStringNotEqual; /* 36 */
+  NLSSlot NLSStringNotEqualLit; /* 37 */
+  NLSSlot NLSStringSubStr; /* 38 */
+  NLSSlot NLSStringStrip; /* 39 */
+  NLSSlot NLSStringByteLength; /* 40 */
+  uint32_t shiftLength; uint32_t reserved41; /* 41 */
+  NLSSlot NLSStringAddQuotes; /* 42 */
+  NLSSlot NLSStringConcat; /* 43 */
+  NLSSlot NLSStringFill; /* 44 */
+  NLSSlot NLSStringFillLit; /* 45 */
+  NLSSlot NLSStringFindCharLit; /* 46 */
+  NLSSlot NLSStringJustify; /* 47 */
+  NLSSlot NLSNumCharsS; /* 48 */
+  NLSSlot NLSBlankPadS; /* 49 */
+  NLSSlot NLSAllBlanksS; /* 50 */
+  NLSSlot NLSStringIndexS; /* 51 */
+  NLSSlot NLSStringEqualsS; /* 52 */
+  NLSSlot NLSStringLowerS; /* 53 */
+  NLSSlot NLSStringUpperS; /* 54 */
+  NLSSlot NLSStringNormalizeS; /* 55 */
+  NLSSlot NLSStringCompareS; /* 56 */
+  NLSSlot NLSStringCompLitS; /* 57 */
+  NLSSlot NLSStringReverseS; /* 58 */
+  NLSSlot NLSStringDeleteS; /* 59 */
+  NLSSlot NLSStringDeleteLitS; /* 60 */
+  NLSSlot NLSStringNotEqualS; /* 61 */
+  NLSSlot NLSStringNotEqualLitS; /* 62 */
+  NLSSlot NLSStringMoveS; /* 63 */
+  NLSSlot NLSStringStripS; /* 64 */
+  NLSSlot NLSStringAddQuotesS; /* 65 */
+  NLSSlot NLSStringConcatS; /* 66 */
+  NLSSlot NLSStringFillS; /* 67 */
+  NLSSlot NLSStringFillLitS; /* 68 */
+  NLSSlot NLSStringFindCharLitS; /* 69 */
+  NLSSlot NLSStringFindCharS; /* 70 */
+  NLSSlot NLSStringJustifyS; /* 71 */
+  NLSSlot NLSStringLength; /* 72 */
+  NLSSlot NLSStringIs; /* 73 */
+  NLSSlot NLSStringIsLower; /* 74 */
+  NLSSlot NLSStringIsDigit; /* 75 */
+  NLSSlot NLSStringIsSpace; /* 76 */
+  NLSSlot NLSStringIsXDigit; /* 77 */
+  NLSSlot NLSStringIsGraph; /* 78 */
+  NLSSlot NLSGetBaseDirection; /* 79 */
+  NLSSlot NLSVisualOrderFormat; /* 80 */
+  NLSSlot NLSLogicalOrderFormat; /* 81 */
+  void *reserved82[4]; /* 82 */
+  NLSSlot NLSStringVerify; /* 86 */
+  NLSSlot NLSStringVerifyS; /* 87 */
+  uint32_t encodingFlags; uint32_t reserved88; /* bit 0: ASCII-based */
+  NLSSlot NLSStringTransliterateLit; /* 89 */
+  NLSSlot NLSStringTransliterateLitS; /* 90 */
+  NLSSlot NLSStringTransliterate; /* 91 */
+  NLSSlot NLSStringTransliterateS; /* 92 */
+  NLSSlot NLSStringRemoveDelimiters; /* 93 */
+  NLSSlot NLSStringRemoveDelimitersS; /* 94 */
+  NLSSlot NLSStringTranword; /* 95 */
+  NLSSlot NLSStringTranwordS; /* 96 */
+  NLSSlot NLSStringSqueezeLit; /* 97 */
+  NLSSlot NLSStringSqueezeLitS; /* 98 */
+  NLSSlot NLSStringSqueeze; /* 99 */
+  NLSSlot NLSStringSqueezeS; /* 100 */
+  NLSSlot NLSStringNLength; /* 101 */
+  NLSSlot NLSStringBLength; /* 102 */
+  int64_t numberForm; /* 4: units stored byte-swapped */
+  NLSSlot NLSStringIndexC; /* 104 */
+  NLSSlot NLSStringEqualsC; /* 105 */
+  NLSSlot NLSStringLowerC; /* 106 */
+  NLSSlot NLSStringUpperC; /* 107 */
+  NLSSlot NLSStringCompStrC; /* 108 */
+  NLSSlot NLSStringCompLitC; /* 109 */
+  NLSSlot NLSStringStripC; /* 110 */
+  NLSSlot NLSStringFindCharLitC; /* 111 */
+  NLSSlot NLSStringFindCharC; /* 112 */
+  NLSSlot NLSStringJustifyC; /* 113 */
+  NLSSlot NLSStringByteLengthC; /* 114 */
+  NLSSlot NLSStringMoveC; /* 115 */
+  void *fromConverter; /* host converter: this encoding -> host characters */
+  void *toConverter; /* host converter: host characters -> this encoding */
+  NLSSlot stringAnyNot; /* 118 */
+  void *reserved119[2]; /* 119 */
+  uint8_t blankChar[8]; /* 121 */
+  uint64_t blankWidth; /* 122 */
+  const uint8_t *charRanges; /* host record block: shift and lead/trail lists */
+  const uint8_t *upperTable; /* 124 */
+  const uint8_t *lowerTable; /* 125 */
+  const uint8_t *foldTable; /* 126 */
+  const void *dbcsTable; /* 127 */
+  uint64_t dbcsTableCount; /* 128 */
+  void *charConverter; /* owned: encoding 62 -> this encoding */
+  void *pool; /* 130 */
+  void *locale; /* owned "en_US" locale */
+  void *ownFromConverter; /* 132 */
+  void *ownToConverter; /* 133 */
+  uint8_t quoteChar[8]; /* 134 */
+  uint64_t quoteWidth; /* 135 */
+  uint8_t charClass[256]; /* 0x44 lead byte, 0x08 trail byte */
+  const uint8_t *classTable; /* 168 */
+  const void *dbcsExtTable; /* 169 */
+  uint64_t dbcsExtCount; /* 170 */
+  void *reserved171[5]; /* 171 */
+  const uint8_t *bidiTable; /* class 0 only */} NLSSMHandle;
+
+#define NLSSM_HANDLE_WORDS 177
+NLSSM_STATIC_ASSERT(sizeof(NLSSMHandle) == NLSSM_HANDLE_WORDS * 8, "handle is 177 words");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, unitWidth) == 4 * 8 + 4, "unitWidth in the high half of word 4");
+NLSSM_STATIC_ASSERT(sizeof(NLSString) == 72, "descriptor is 7 words and 3 u32");
+NLSSM_STATIC_ASSERT(offsetof(NLSString, charKind) == 56, "charKind after the seven words");
+NLSSM_STATIC_ASSERT(offsetof(NLSChar, charBytes) == 72, "charBytes follows the descriptor");
+NLSSM_STATIC_ASSERT(offsetof(NLSChar, bytes) == 80, "inline buffer follows charBytes");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, magic) == 0 * 8, "magic at word 0");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, name) == 1 * 8, "name at word 1");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, destroy) == 2 * 8, "destroy at word 2");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, owner) == 3 * 8, "owner at word 3");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, encodingNumber) == 4 * 8, "encodingNumber at word 4");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, encodingClass) == 5 * 8, "encodingClass at word 5");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSNumChars) == 6 * 8, "NLSNumChars at word 6");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSBlankPad) == 7 * 8, "NLSBlankPad at word 7");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSAllBlanks) == 8 * 8, "NLSAllBlanks at word 8");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringIndex) == 9 * 8, "NLSStringIndex at word 9");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringEquals) == 10 * 8, "NLSStringEquals at word 10");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringLower) == 11 * 8, "NLSStringLower at word 11");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringUpper) == 12 * 8, "NLSStringUpper at word 12");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringNormalize) == 13 * 8, "NLSStringNormalize at word 13");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringInit) == 14 * 8, "NLSStringInit at word 14");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSCharInit) == 15 * 8, "NLSCharInit at word 15");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringClean) == 16 * 8, "NLSStringClean at word 16");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, stringDupPos) == 17 * 8, "stringDupPos at word 17");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, stringGetPos) == 18 * 8, "stringGetPos at word 18");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, stringSetPos) == 19 * 8, "stringSetPos at word 19");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, stringNextChar) == 20 * 8, "stringNextChar at word 20");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, stringNextCharB) == 21 * 8, "stringNextCharB at word 21");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, reserved22) == 22 * 8, "reserved22 at word 22");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringCompLit) == 23 * 8, "NLSStringCompLit at word 23");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringCompStr) == 24 * 8, "NLSStringCompStr at word 24");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringCompare) == 25 * 8, "NLSStringCompare at word 25");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, stringCurCharSize) == 26 * 8, "stringCurCharSize at word 26");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringLike) == 27 * 8, "NLSStringLike at word 27");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringContains) == 28 * 8, "NLSStringContains at word 28");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFromDouble) == 29 * 8, "NLSStringFromDouble at word 29");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFromIntmax) == 30 * 8, "NLSStringFromIntmax at word 30");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringToDouble) == 31 * 8, "NLSStringToDouble at word 31");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringToIntmax) == 32 * 8, "NLSStringToIntmax at word 32");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringReverse) == 33 * 8, "NLSStringReverse at word 33");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringDelete) == 34 * 8, "NLSStringDelete at word 34");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringDeleteLit) == 35 * 8, "NLSStringDeleteLit at word 35");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringNotEqual) == 36 * 8, "NLSStringNotEqual at word 36");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringNotEqualLit) == 37 * 8, "NLSStringNotEqualLit at word 37");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringSubStr) == 38 * 8, "NLSStringSubStr at word 38");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringStrip) == 39 * 8, "NLSStringStrip at word 39");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringByteLength) == 40 * 8, "NLSStringByteLength at word 40");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, shiftLength) == 41 * 8, "shiftLength at word 41");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringAddQuotes) == 42 * 8, "NLSStringAddQuotes at word 42");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringConcat) == 43 * 8, "NLSStringConcat at word 43");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFill) == 44 * 8, "NLSStringFill at word 44");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFillLit) == 45 * 8, "NLSStringFillLit at word 45");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFindCharLit) == 46 * 8, "NLSStringFindCharLit at word 46");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringJustify) == 47 * 8, "NLSStringJustify at word 47");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSNumCharsS) == 48 * 8, "NLSNumCharsS at word 48");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSBlankPadS) == 49 * 8, "NLSBlankPadS at word 49");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSAllBlanksS) == 50 * 8, "NLSAllBlanksS at word 50");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringIndexS) == 51 * 8, "NLSStringIndexS at word 51");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringEqualsS) == 52 * 8, "NLSStringEqualsS at word 52");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringLowerS) == 53 * 8, "NLSStringLowerS at word 53");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringUpperS) == 54 * 8, "NLSStringUpperS at word 54");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringNormalizeS) == 55 * 8, "NLSStringNormalizeS at word 55");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringCompareS) == 56 * 8, "NLSStringCompareS at word 56");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringCompLitS) == 57 * 8, "NLSStringCompLitS at word 57");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringReverseS) == 58 * 8, "NLSStringReverseS at word 58");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringDeleteS) == 59 * 8, "NLSStringDeleteS at word 59");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringDeleteLitS) == 60 * 8, "NLSStringDeleteLitS at word 60");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringNotEqualS) == 61 * 8, "NLSStringNotEqualS at word 61");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringNotEqualLitS) == 62 * 8, "NLSStringNotEqualLitS at word 62");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringMoveS) == 63 * 8, "NLSStringMoveS at word 63");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringStripS) == 64 * 8, "NLSStringStripS at word 64");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringAddQuotesS) == 65 * 8, "NLSStringAddQuotesS at word 65");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringConcatS) == 66 * 8, "NLSStringConcatS at word 66");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFillS) == 67 * 8, "NLSStringFillS at word 67");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFillLitS) == 68 * 8, "NLSStringFillLitS at word 68");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFindCharLitS) == 69 * 8, "NLSStringFindCharLitS at word 69");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFindCharS) == 70 * 8, "NLSStringFindCharS at word 70");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringJustifyS) == 71 * 8, "NLSStringJustifyS at word 71");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringLength) == 72 * 8, "NLSStringLength at word 72");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringIs) == 73 * 8, "NLSStringIs at word 73");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringIsLower) == 74 * 8, "NLSStringIsLower at word 74");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringIsDigit) == 75 * 8, "NLSStringIsDigit at word 75");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringIsSpace) == 76 * 8, "NLSStringIsSpace at word 76");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringIsXDigit) == 77 * 8, "NLSStringIsXDigit at word 77");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringIsGraph) == 78 * 8, "NLSStringIsGraph at word 78");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSGetBaseDirection) == 79 * 8, "NLSGetBaseDirection at word 79");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSVisualOrderFormat) == 80 * 8, "NLSVisualOrderFormat at word 80");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSLogicalOrderFormat) == 81 * 8, "NLSLogicalOrderFormat at word 81");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, reserved82) == 82 * 8, "reserved82 at word 82");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringVerify) == 86 * 8, "NLSStringVerify at word 86");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringVerifyS) == 87 * 8, "NLSStringVerifyS at word 87");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, encodingFlags) == 88 * 8, "encodingFlags at word 88");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringTransliterateLit) == 89 * 8, "NLSStringTransliterateLit at word 89");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringTransliterateLitS) == 90 * 8, "NLSStringTransliterateLitS at word 90");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringTransliterate) == 91 * 8, "NLSStringTransliterate at word 91");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringTransliterateS) == 92 * 8, "NLSStringTransliterateS at word 92");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringRemoveDelimiters) == 93 * 8, "NLSStringRemoveDelimiters at word 93");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringRemoveDelimitersS) == 94 * 8, "NLSStringRemoveDelimitersS at word 94");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringTranword) == 95 * 8, "NLSStringTranword at word 95");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringTranwordS) == 96 * 8, "NLSStringTranwordS at word 96");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringSqueezeLit) == 97 * 8, "NLSStringSqueezeLit at word 97");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringSqueezeLitS) == 98 * 8, "NLSStringSqueezeLitS at word 98");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringSqueeze) == 99 * 8, "NLSStringSqueeze at word 99");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringSqueezeS) == 100 * 8, "NLSStringSqueezeS at word 100");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringNLength) == 101 * 8, "NLSStringNLength at word 101");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringBLength) == 102 * 8, "NLSStringBLength at word 102");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, numberForm) == 103 * 8, "numberForm at word 103");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringIndexC) == 104 * 8, "NLSStringIndexC at word 104");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringEqualsC) == 105 * 8, "NLSStringEqualsC at word 105");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringLowerC) == 106 * 8, "NLSStringLowerC at word 106");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringUpperC) == 107 * 8, "NLSStringUpperC at word 107");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringCompStrC) == 108 * 8, "NLSStringCompStrC at word 108");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringCompLitC) == 109 * 8, "NLSStringCompLitC at word 109");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringStripC) == 110 * 8, "NLSStringStripC at word 110");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFindCharLitC) == 111 * 8, "NLSStringFindCharLitC at word 111");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringFindCharC) == 112 * 8, "NLSStringFindCharC at word 112");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringJustifyC) == 113 * 8, "NLSStringJustifyC at word 113");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringByteLengthC) == 114 * 8, "NLSStringByteLengthC at word 114");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, NLSStringMoveC) == 115 * 8, "NLSStringMoveC at word 115");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, fromConverter) == 116 * 8, "fromConverter at word 116");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, toConverter) == 117 * 8, "toConverter at word 117");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, stringAnyNot) == 118 * 8, "stringAnyNot at word 118");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, reserved119) == 119 * 8, "reserved119 at word 119");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, blankChar) == 121 * 8, "blankChar at word 121");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, blankWidth) == 122 * 8, "blankWidth at word 122");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, charRanges) == 123 * 8, "charRanges at word 123");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, upperTable) == 124 * 8, "upperTable at word 124");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, lowerTable) == 125 * 8, "lowerTable at word 125");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, foldTable) == 126 * 8, "foldTable at word 126");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, dbcsTable) == 127 * 8, "dbcsTable at word 127");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, dbcsTableCount) == 128 * 8, "dbcsTableCount at word 128");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, charConverter) == 129 * 8, "charConverter at word 129");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, pool) == 130 * 8, "pool at word 130");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, locale) == 131 * 8, "locale at word 131");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, ownFromConverter) == 132 * 8, "ownFromConverter at word 132");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, ownToConverter) == 133 * 8, "ownToConverter at word 133");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, quoteChar) == 134 * 8, "quoteChar at word 134");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, quoteWidth) == 135 * 8, "quoteWidth at word 135");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, charClass) == 136 * 8, "charClass at word 136");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, classTable) == 168 * 8, "classTable at word 168");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, dbcsExtTable) == 169 * 8, "dbcsExtTable at word 169");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, dbcsExtCount) == 170 * 8, "dbcsExtCount at word 170");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, reserved171) == 171 * 8, "reserved171 at word 171");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMHandle, bidiTable) == 176 * 8, "bidiTable at word 176");
+/* ---- Module object and version record ------------------------------------ */
+typedef struct NLSSMModule {
+  char magic[8]; /* "nevo" */
+  void *reserved1[2];
+  NLSSlot reqVersion;
+  NLSSlot version;
+  void *host;
+  NLSSlot realDestroy;
+  void *reserved7[2];
+  void *pool;
+  NLSSlot create;
+  NLSSlot destroyCallback;
+} NLSSMModule;
+
+NLSSM_STATIC_ASSERT(sizeof(NLSSMModule) == 12 * 8, "module object is 12 words");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMModule, reqVersion) == 3 * 8, "reqVersion at word 3");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMModule, version) == 4 * 8, "version at word 4");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMModule, host) == 5 * 8, "host at word 5");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMModule, realDestroy) == 6 * 8, "realDestroy at word 6");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMModule, pool) == 9 * 8, "pool at word 9");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMModule, create) == 10 * 8, "create at word 10");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMModule, destroyCallback) == 11 * 8, "destroyCallback at word 11");
+
+/* The version record: 26 words, mostly pointers to constant text. */
+typedef struct NLSSMVersionInfo {
+  const char *version;          /* "V.03.01M0P09072016" */
+  const char *buildId;          /* 13 characters: build host and branch */
+  const char *empty2;
+  int64_t buildTime;            /* seconds since 1970-01-01 UTC */
+  const char *nlsExtension;     /* "qvnls" */
+  const char *nlsSignature;     /* 7 letters and digits */
+  const char *loaderExtension;  /* "qvext" */
+  const char *loaderSignature;  /* 18 letters, digits and '-' */
+  const char *empty8;
+  const char *versionKey;       /* "version" */
+  const char *separator;        /* "::" */
+  const char *empty11;
+  const char *hotfixLabel;      /* "KAL_VERSION_HOTFIX_NUMBER=" blank-padded to 65 */
+  const char *hotfixSignature;  /* 13 letters and digits */
+  const char *imageLabel;       /* "VERCON_IMAGE_DESCRIPTION=" blank-padded to 65 */
+  const char *imageName;        /* "hdlno" */
+  const char *buildDate;        /* "Wed Sep  7 22:26:00 EDT 2016" */
+  uint64_t reserved[9];
+} NLSSMVersionInfo;
+
+NLSSM_STATIC_ASSERT(sizeof(NLSSMVersionInfo) == 26 * 8, "version record is 26 words");
+NLSSM_STATIC_ASSERT(offsetof(NLSSMVersionInfo, buildDate) == 16 * 8, "build date at word 16");
+
+/* ---- Module entry ---------------------------------------------------------- */
+/* Copies the 208-byte version record (the pointers, not the texts). */
+NLSSM_API void qvvercn1(void *destination);
+/* Builds the module object in a pool of its own; null on failure. */
+NLSSM_API NLSSMModule *qvnlssm(void *host, void *journal);
+/* The host version the module requires: 6.1.1. */
+NLSSM_API int64_t reqVersion(NLSSMModule *module, int64_t *major, int64_t *minor, int64_t *patch);
+/* The module's own interface version: 6.0.0. */
+NLSSM_API int64_t version(NLSSMModule *module, int64_t *major, int64_t *minor, int64_t *patch);
+NLSSM_API int64_t NLSSMRealDestroy(NLSSMModule *module);
+
+/* ---- Handle creation and release ------------------------------------------ */
+NLSSM_API int64_t NLSSMCreate(void *nlsObject, int64_t encodingNumber, void *reserved,
+                              NLSSMHandle **outHandle);
+NLSSM_API int64_t NLSSMDestroy(NLSSMHandle *handle);
+NLSSM_API int64_t NLSSMDestroyCallback(void *entry);
+
+/* ---- Operations common to every class ------------------------------------- */
+NLSSM_API int64_t NLSStringInit(const NLSSMHandle *handle, NLSString *string);
+NLSSM_API int64_t NLSStringClean(const NLSSMHandle *handle, NLSString *string);
+NLSSM_API int64_t stringDupPos(const NLSSMHandle *handle, const NLSString *from, NLSString *to);
+NLSSM_API int64_t stringGetPos(const NLSSMHandle *handle, const NLSString *string);
+NLSSM_API int64_t stringNextCharB(const NLSSMHandle *handle, NLSString *string, int64_t flag);
+/* Builds a one-character record from one byte of encoding 62. */
+NLSSM_API int64_t NLSCharInit(const NLSSMHandle *handle, const uint8_t *source, int64_t ignored,
+                              NLSChar *record);
+NLSSM_API int64_t NLSCharInit_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                   int64_t ignored, NLSChar *record);
+
+/* ---- Kernel primitives -------------------------------------------------------
+ * Several take the source before the destination. */
+NLSSM_API int64_t skUnsup(void);
+NLSSM_API int64_t skStrLen(const uint8_t *string);
+NLSSM_API int64_t skStrTLen(const uint32_t *string);
+NLSSM_API void skStrCpy(const uint8_t *source, uint8_t *destination);
+NLSSM_API void skStrTCpy(const uint32_t *source, uint32_t *destination);
+NLSSM_API void skStrUp(uint8_t *bytes, int64_t length);
+NLSSM_API void skStrLow(uint8_t *bytes, int64_t length);
+NLSSM_API int64_t skMemNot(uint8_t value, const uint8_t *buffer, int64_t length);
+NLSSM_API int64_t skMemTNot(uint32_t value, const uint32_t *buffer, int64_t length);
+NLSSM_API void skMemSet(uint8_t *buffer, uint8_t value, int64_t length);
+NLSSM_API void skMemTSet(uint32_t *buffer, uint32_t value, int64_t length);
+NLSSM_API int64_t skMemCmp(const uint8_t *a, const uint8_t *b, int64_t length);
+NLSSM_API int64_t skWMemCmp(const uint32_t *a, const uint32_t *b, int64_t length);
+NLSSM_API void *skMemCpy(const void *source, void *destination, int64_t length);
+NLSSM_API void *skMemSCpy(const void *source, void *destination, int64_t length);
+/* allocator: a host object whose slot 3 allocates (object, size, flags). */
+NLSSM_API void *skMemDup(const void *source, int64_t length, void *allocator);
+NLSSM_API int64_t skMemScan(const uint8_t *buffer, int64_t length, uint8_t byte);
+NLSSM_API int64_t skMemNScan(const uint8_t *buffer, int64_t length, uint8_t byte);
+NLSSM_API int64_t skMemTNScan(const uint32_t *buffer, int64_t count, uint32_t value);
+NLSSM_API int64_t skMissArray(const double *values, int64_t count);
+
+/* ---- Extension version and message forwarders ----------------------------- */
+/* The host's service object, kept by qvextent. */
+NLSSM_DATA_API void *Exported_QVHandle;
+NLSSM_API int64_t qvextver(void *hostHandle, int64_t *major, int64_t *minor);
+NLSSM_API int64_t qvextent(void *hostHandle);
+NLSSM_API int64_t qvlMessageToBuf(void *messageObject, void *a1, void *a2, void *a3, void *a4,
+                                  void *a5, ...);
+NLSSM_API int64_t qvlMessageToJnl(void *hostObject, uint32_t messageNumber, void *a1, void *a2,
+                                  ...);
+NLSSM_API int64_t qvlStatusToBuf(void *hostObject, uint32_t status, void *a1, void *a2, void *a3,
+                                 ...);
+NLSSM_API int64_t qvlStatusToJnl(void *hostObject, uint32_t messageNumber, uint32_t status, ...);
+NLSSM_API int64_t qvlGetLocale(void *hostObject, ...);
+
+/* ---- Catalogue tables ------------------------------------------------------ */
+
+/* ---- UTF conversions ------------------------------------------------------- */
+
+#endif /* NLSSM_NLSSM_H */
