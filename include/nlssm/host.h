@@ -45,6 +45,16 @@ typedef void (*NLSHostPoolDestroyFn)(void *pool);
 typedef void *(*NLSHostPoolAllocateFn)(void *pool, uint64_t size, uint32_t flags);
 typedef void (*NLSHostPoolFreeFn)(void *pool, void *memory);
 
+/* ---- Converter -------------------------------------------------------------- */
+#define NLSHOST_SLOT_CONVERTER_DESTROY 2
+#define NLSHOST_SLOT_CONVERTER_CONVERT 4
+typedef void (*NLSHostConverterDestroyFn)(void *converter);
+/* Returns a status; the produced byte count goes through producedBytes. */
+typedef int64_t (*NLSHostConverterConvertFn)(void *converter, const void *source,
+                                             uint64_t sourceBytes, void *destination,
+                                             uint64_t destinationSize, uint64_t *producedBytes,
+                                             void *reserved);
+
 /* ---- Journal and message object ---------------------------------------------
  * The object given to the message forwarders (and the journal given to
  * qvnlssm). Its operations stand in this order; the slot numbers are the
