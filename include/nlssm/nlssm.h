@@ -514,6 +514,137 @@ NLSSM_API int64_t qvlGetLocale(void *hostObject, ...);
 
 /* ---- Catalogue tables ------------------------------------------------------ */
 
-/* ---- UTF conversions ------------------------------------------------------- */
+/* ---- UTF conversions -------------------------------------------------------
+ * One-character codecs between UTF-8, UTF-16 and UTF-32, two buffer drivers,
+ * a UTF-8 legality test and a UTF-8 length counter. Statuses come back
+ * zero-extended in the int64_t result. Out pointers may be null (not written).
+ * The decoder and encoder tables they use are internal to the module.
+ *
+ * Reads past the stated length: some decoders read a fixed number of bytes
+ * whatever remains. Each says below how far past `remaining` it may read
+ * (counted from source + remaining, for remaining >= 1); a caller that cannot
+ * guarantee those bytes are readable pads its buffer by that many bytes.
+ * Encoders that write "without a capacity check" may write that many bytes
+ * into a smaller destination. */
+
+/* (source, bytes remaining, out code point, out bytes consumed) -> status */
+typedef int64_t (*NLSUTFDecoder)(const uint8_t *source, int64_t remaining, uint32_t *codePoint,
+                                 int64_t *consumed);
+/* (code point, destination, capacity in bytes, out bytes written) -> status */
+typedef int64_t (*NLSUTFEncoder)(uint32_t codePoint, uint8_t *destination, int64_t capacity,
+                                 int64_t *written);
+
+/* UTF-8 -> code point. Judges the lead byte only: a valid lead (00-7F, C2-F4)
+ * takes the continuation bytes it announces unchecked (so overlong E0 80..9F
+ * and surrogates ED A0..BF decode); with too few bytes remaining: U+FFFD,
+ * consumed = remaining, NLSSM_E_TRUNCATED_SEQUENCE. An invalid lead gives
+ * U+FFFD and NLSSM_E_ILL_FORMED and skips the continuation bytes after it, up
+ * to the length the lead announces (2 for C0-C1, 4 for F5-F7, 5 for F8-FB, 6
+ * for FC-FF) regardless of `remaining`.
+ * Reads up to 5 bytes past `remaining` (6 when remaining <= 0). */
+NLSSM_API int64_t UTF8_UTF32(const uint8_t *source, int64_t remaining, uint32_t *codePoint,
+                             int64_t *consumed);
+/* Big-endian UTF-16 -> code point. A lone low surrogate: U+FFFD, consumed 2,
+ * NLSSM_E_ILL_FORMED. A high surrogate with remaining < 2: U+FFFD, consumed 1,
+ * NLSSM_E_TRUNCATED_SEQUENCE; with remaining 2 or 3 the next unit is read
+ * anyway. A high surrogate not followed by a low one: U+FFFD, consumed 4,
+ * NLSSM_E_ILL_FORMED. Reads up to 2 bytes past `remaining`. */
+NLSSM_API int64_t UTF16_UTF32(const uint8_t *source, int64_t remaining, uint32_t *codePoint,
+                              int64_t *consumed);
+/* As UTF16_UTF32 with little-endian units. Reads up to 2 bytes past. */
+NLSSM_API int64_t UTF16_UTF32_SWAP(const uint8_t *source, int64_t remaining, uint32_t *codePoint,
+                                   int64_t *consumed);
+/* One big-endian 32-bit unit; consumed 4; never fails. Reads 4 bytes: up to
+ * 3 past `remaining`. */
+NLSSM_API int64_t COPY_UTF32b(const uint8_t *source, int64_t remaining, uint32_t *codePoint,
+                              int64_t *consumed);
+/* One 32-bit unit in the machine's order; otherwise as COPY_UTF32b. */
+NLSSM_API int64_t COPY_UTF32b_SWAP(const uint8_t *source, int64_t remaining,
+                                   uint32_t *codePoint, int64_t *consumed);
+/* One UTF-8 character (decoded as UTF8_UTF32) -> one or two UTF-16 units of
+ * the machine's order in units[0..1]. Any failure stores the single unit
+ * 0xFFFD and returns NLSSM_E_ILL_FORMED. Reads as UTF8_UTF32. */
+NLSSM_API int64_t UTF8_UTF16(const uint8_t *source, int64_t remaining, uint16_t *units,
+                             int64_t *consumed);
+
+/* Code point -> UTF-8, 1 to 4 bytes. Below 0x80 one byte is written without
+ * a capacity check; otherwise a capacity below the length gives written 0 and
+ * NLSSM_E_DEST_TOO_SMALL. Values from 0x10000 up (also above 0x10FFFF) take
+ * the four-byte form. */
+NLSSM_API int64_t UTF32_UTF8(uint32_t codePoint, uint8_t *destination, int64_t capacity,
+                             int64_t *written);
+/* The low 16 bits as one UTF-16 unit -> UTF-8 as UTF32_UTF8; a surrogate
+ * unit becomes its own three-byte sequence. */
+NLSSM_API int64_t UTF16_UTF8(uint32_t unit, uint8_t *destination, int64_t capacity,
+                             int64_t *written);
+/* Big-endian 32-bit unit; capacity < 4: written 0, NLSSM_E_DEST_TOO_SMALL. */
+NLSSM_API int64_t COPY_UTF32(uint32_t codePoint, uint8_t *destination, int64_t capacity,
+                             int64_t *written);
+/* Little-endian 32-bit unit; same check. */
+NLSSM_API int64_t COPY_UTF32_SWAP(uint32_t codePoint, uint8_t *destination, int64_t capacity,
+                                  int64_t *written);
+/* The low 16 bits as one little-endian unit; written 2 without a capacity
+ * check. */
+NLSSM_API int64_t UTF32_UTF16(uint32_t codePoint, uint8_t *destination, int64_t capacity,
+                              int64_t *written);
+/* The low 16 bits as one big-endian unit; written 2 without a capacity check. */
+NLSSM_API int64_t UTF32_UTF16_SWAP(uint32_t codePoint, uint8_t *destination, int64_t capacity,
+                                   int64_t *written);
+/* Code point -> little-endian UTF-16. Below 0x10000 one unit, written 2
+ * without a capacity check; otherwise a surrogate pair (written 4) or, with
+ * capacity < 4, NLSSM_E_DEST_TOO_SMALL and `written` left untouched. */
+NLSSM_API int64_t UTF32_UTF16s(uint32_t codePoint, uint8_t *destination, int64_t capacity,
+                               int64_t *written);
+/* As UTF32_UTF16s with big-endian units. */
+NLSSM_API int64_t UTF32_UTF16s_SWAP(uint32_t codePoint, uint8_t *destination, int64_t capacity,
+                                    int64_t *written);
+
+/* Copies min(sourceBytes, capacity) bytes; NLSSM_E_DEST_TOO_SMALL when the
+ * source is longer than the capacity (the part that fits is still copied). */
+NLSSM_API int64_t COPY_UTF(const uint8_t *source, int64_t sourceBytes, uint8_t *destination,
+                           int64_t capacity, int64_t *written);
+
+/* Assemble 16 or 32 bits from bytes: Byte2Word and Byte2DWord little-endian,
+ * their _swap forms big-endian; BYTE_UTF16_UTF32 big-endian 16 bits, its
+ * _SWAP form little-endian. Read exactly 2 or 4 bytes. */
+NLSSM_API uint16_t Byte2Word(const uint8_t *bytes);
+NLSSM_API uint16_t Byte2Word_swap(const uint8_t *bytes);
+NLSSM_API uint32_t Byte2DWord(const uint8_t *bytes);
+NLSSM_API uint32_t Byte2DWord_swap(const uint8_t *bytes);
+NLSSM_API uint32_t BYTE_UTF16_UTF32(const uint8_t *bytes);
+NLSSM_API uint32_t BYTE_UTF16_UTF32_SWAP(const uint8_t *bytes);
+
+/* Decodes `source` with `decoder` and stores each code point with `encoder`
+ * in a 4-byte slot of `destination`: at most capacity / 4 characters. Stops at
+ * the first decoder or encoder failure and returns that status (the failing
+ * character is not stored), else 0. `written` = 4 x characters stored. Reads
+ * past sourceBytes as far as the decoder does (UTF8_UTF32: 5, UTF16_UTF32: 2,
+ * COPY_UTF32b: 3). Writes stay inside the capacity with the encoders above. */
+NLSSM_API int64_t ConvertToUTF32(const void *source, int64_t sourceBytes, void *destination,
+                                 int64_t capacity, int64_t *written, NLSUTFDecoder decoder,
+                                 NLSUTFEncoder encoder);
+/* Encodes sourceBytes / 4 units of `source` (read with `decoder`, whose
+ * status is ignored) with `encoder` until the capacity is used up. Note the
+ * argument order: encoder first. Returns the encoder's failing status, else 0;
+ * `written` = total bytes written. A character that an encoder would write
+ * without a capacity check past the end of the destination is not written and
+ * stops the loop with NLSSM_E_DEST_TOO_SMALL. Reads no byte past sourceBytes
+ * rounded down to whole units. */
+NLSSM_API int64_t ConvertFromUTF32(const void *source, int64_t sourceBytes, void *destination,
+                                   int64_t capacity, int64_t *written, NLSUTFEncoder encoder,
+                                   NLSUTFDecoder decoder);
+
+/* 1 when the `length` bytes (the length the lead byte announces) are one
+ * well-formed UTF-8 character, else 0. Lengths other than 1-4 are legal
+ * without reading. Continuation bytes 3, 2, 1 are checked in that order, the
+ * failing one stored in `badIndex` (else `length`); then byte 1 against the
+ * lead (E0 needs >= A0, ED <= 9F, F0 >= 90; no upper bound after F4), then the
+ * lead itself. Reads exactly `length` bytes. */
+NLSSM_API int64_t isLegalUTF8(const uint8_t *bytes, int64_t length, int64_t *badIndex);
+
+/* Total UTF-8 bytes of `count` 32-bit characters: 1 up to 0x7F, 2 up to
+ * 0x7FF, 3 below 0x10000, else 4. Null or count <= 0 gives 0. Reads exactly
+ * `count` units. */
+NLSSM_API int64_t GET_UTF8_LEN_FROM_QVCHAR(const uint32_t *chars, int64_t count);
 
 #endif /* NLSSM_NLSSM_H */

@@ -1,0 +1,428 @@
+// One-character codecs between UTF-8, UTF-16 and UTF-32, as policy types
+// with a static `decode` or `encode`, plus the buffer drivers that run a
+// decoder and an encoder over a whole buffer. The exported C functions are
+// thin wrappers over these; the drivers are templates so that a known pair
+// of codecs runs inline instead of through function pointers.
+//
+// Statuses are the module's 32-bit codes. Out pointers may be null; a null
+// one is simply not written.
+#pragma once
+
+#include <nlssm/nlssm.h>
+
+#include <algorithm>
+#include <bit>
+#include <cstdint>
+#include <cstring>
+
+#include "unicode/tables.hpp"
+
+namespace nlssm::unicode {
+
+inline constexpr uint32_t kReplacement = 0xFFFD;
+
+// ---- Byte orders ------------------------------------------------------------
+enum class Order { big, little, native };
+
+template <Order O>
+inline constexpr bool kIsBig = O == Order::big ||
+                               (O == Order::native && std::endian::native == std::endian::big);
+
+template <Order O>
+inline uint16_t load16(const uint8_t *p) {
+  if constexpr (kIsBig<O>)
+    return static_cast<uint16_t>(p[0] << 8 | p[1]);
+  else
+    return static_cast<uint16_t>(p[1] << 8 | p[0]);
+}
+
+template <Order O>
+inline uint32_t load32(const uint8_t *p) {
+  if constexpr (kIsBig<O>)
+    return uint32_t{p[0]} << 24 | uint32_t{p[1]} << 16 | uint32_t{p[2]} << 8 | p[3];
+  else
+    return uint32_t{p[3]} << 24 | uint32_t{p[2]} << 16 | uint32_t{p[1]} << 8 | p[0];
+}
+
+template <Order O>
+inline void store16(uint8_t *p, uint32_t v) {
+  const uint8_t hi = static_cast<uint8_t>(v >> 8), lo = static_cast<uint8_t>(v);
+  p[0] = kIsBig<O> ? hi : lo;
+  p[1] = kIsBig<O> ? lo : hi;
+}
+
+template <Order O>
+inline void store32(uint8_t *p, uint32_t v) {
+  for (int i = 0; i < 4; ++i) {
+    const int shift = kIsBig<O> ? 24 - 8 * i : 8 * i;
+    p[i] = static_cast<uint8_t>(v >> shift);
+  }
+}
+
+template <typename T>
+inline void put(T *out, T value) {
+  if (out != nullptr) *out = value;
+}
+
+// ---- Decoders: (source, bytes remaining, code point, consumed) -> status ----
+
+// UTF-8. Only the lead byte is judged: the continuation bytes of a valid lead
+// are taken as they are (callers that need strictness use is_legal_utf8).
+// After an invalid lead, continuation bytes are skipped up to the length the
+// lead announces, without regard to the bytes remaining.
+struct Utf8Decoder {
+  static constexpr bool kAsciiRuns = true;  // one byte per character below 0x80
+
+  static inline uint32_t decode(const uint8_t *s, int64_t remaining, uint32_t *cp,
+                                int64_t *consumed) {
+    const uint8_t b = s[0];
+    if (b < 0x80) {
+      put(cp, uint32_t{b});
+      put(consumed, int64_t{1});
+      return NLSSM_OK;
+    }
+    const int len = kit::bytesFromUTF8[b];
+    if (valid_1st_utf8[b]) {
+      if (remaining < len) {
+        put(cp, kReplacement);
+        put(consumed, remaining > 0 ? remaining : 0);
+        return NLSSM_E_TRUNCATED_SEQUENCE;
+      }
+      uint32_t c = b & utf8_mask[len];
+      for (int i = 1; i < len; ++i) c = c << 6 | (s[i] & 0x3F);
+      put(cp, c);
+      put(consumed, int64_t{len});
+      return NLSSM_OK;
+    }
+    int64_t k = 1;
+    while (k < len && valid_2nd_utf8[s[k]]) ++k;
+    put(cp, kReplacement);
+    put(consumed, k);
+    return NLSSM_E_ILL_FORMED;
+  }
+};
+
+// UTF-16 in the given unit order. A truncated high surrogate is detected
+// only when fewer than 2 bytes remain; with 2 or 3 the second unit is read
+// from the bytes that follow.
+template <Order O>
+struct Utf16Decoder {
+  static constexpr bool kAsciiRuns = false;
+
+  static inline uint32_t decode(const uint8_t *s, int64_t remaining, uint32_t *cp,
+                                int64_t *consumed) {
+    const uint32_t u = load16<O>(s);
+    if ((u & 0xFC00) != 0xD800) {
+      const bool lone_low = (u & 0xFC00) == 0xDC00;
+      put(cp, lone_low ? kReplacement : u);
+      put(consumed, int64_t{2});
+      return lone_low ? NLSSM_E_ILL_FORMED : NLSSM_OK;
+    }
+    if (remaining < 2) {
+      put(cp, kReplacement);
+      put(consumed, int64_t{1});
+      return NLSSM_E_TRUNCATED_SEQUENCE;
+    }
+    const uint32_t v = load16<O>(s + 2);
+    put(consumed, int64_t{4});
+    if ((v & 0xFC00) != 0xDC00) {
+      put(cp, kReplacement);
+      return NLSSM_E_ILL_FORMED;
+    }
+    put(cp, (((u & 0x3FF) << 10) | (v & 0x3FF)) + 0x10000);
+    return NLSSM_OK;
+  }
+};
+
+// One 32-bit unit in the given order; never fails.
+template <Order O>
+struct Utf32Decoder {
+  static constexpr bool kAsciiRuns = false;
+
+  static inline uint32_t decode(const uint8_t *s, int64_t, uint32_t *cp, int64_t *consumed) {
+    put(cp, load32<O>(s));
+    put(consumed, int64_t{4});
+    return NLSSM_OK;
+  }
+};
+
+// ---- Encoders: (code point, destination, capacity, written) -> status -------
+
+// UTF-8. ASCII is written without looking at the capacity. Every value from
+// 0x10000 up takes the four-byte form, whatever its lead byte becomes.
+struct Utf8Encoder {
+  static constexpr bool kFixedWidth4 = false;
+
+  static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
+    if (c < 0x80) {
+      d[0] = static_cast<uint8_t>(c);
+      put(written, int64_t{1});
+      return NLSSM_OK;
+    }
+    const int len = c < 0x800 ? 2 : c < 0x10000 ? 3 : 4;
+    if (capacity < len) {
+      put(written, int64_t{0});
+      return NLSSM_E_DEST_TOO_SMALL;
+    }
+    static constexpr uint8_t kMarker[5] = {0, 0, 0xC0, 0xE0, 0xF0};
+    for (int i = len - 1; i > 0; --i) {
+      d[i] = static_cast<uint8_t>(0x80 + (c & 0x3F));
+      c >>= 6;
+    }
+    d[0] = static_cast<uint8_t>(kMarker[len] + c);
+    put(written, int64_t{len});
+    return NLSSM_OK;
+  }
+};
+
+// One UTF-16 unit: a surrogate becomes its own three-byte sequence.
+struct Utf16UnitToUtf8Encoder {
+  static constexpr bool kFixedWidth4 = false;
+
+  static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
+    return Utf8Encoder::encode(c & 0xFFFF, d, capacity, written);
+  }
+};
+
+// The low 16 bits as one unit, without a capacity check.
+template <Order O>
+struct Utf16UnitEncoder {
+  static constexpr bool kFixedWidth4 = false;
+
+  static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t, int64_t *written) {
+    store16<O>(d, c);
+    put(written, int64_t{2});
+    return NLSSM_OK;
+  }
+};
+
+// UTF-16 with surrogate pairs. A BMP unit is written without a capacity
+// check; a pair that does not fit leaves `written` untouched.
+template <Order O>
+struct Utf16Encoder {
+  static constexpr bool kFixedWidth4 = false;
+
+  static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
+    if (c < 0x10000) {
+      store16<O>(d, c);
+      put(written, int64_t{2});
+      return NLSSM_OK;
+    }
+    if (capacity < 4) return NLSSM_E_DEST_TOO_SMALL;
+    store16<O>(d, (((c - 0x10000) & 0xFFC00) >> 10) | 0xD800);
+    store16<O>(d + 2, (c & 0x3FF) | 0xDC00);
+    put(written, int64_t{4});
+    return NLSSM_OK;
+  }
+};
+
+// One 32-bit unit in the given order.
+template <Order O>
+struct Utf32Encoder {
+  static constexpr bool kFixedWidth4 = true;
+  static constexpr bool kBigEndian = kIsBig<O>;
+
+  static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
+    if (capacity < 4) {
+      put(written, int64_t{0});
+      return NLSSM_E_DEST_TOO_SMALL;
+    }
+    store32<O>(d, c);
+    put(written, int64_t{4});
+    return NLSSM_OK;
+  }
+};
+
+// One UTF-8 character into UTF-16 units of native order; the caller's
+// buffer takes up to two units. Every failure stores a single 0xFFFD.
+inline uint32_t utf8_to_utf16_units(const uint8_t *s, int64_t remaining, uint16_t *units,
+                                    int64_t *consumed) {
+  uint32_t c = 0;
+  if (Utf8Decoder::decode(s, remaining, &c, consumed) != NLSSM_OK) {
+    units[0] = static_cast<uint16_t>(kReplacement);
+    return NLSSM_E_ILL_FORMED;
+  }
+  if (c < 0x10000) {
+    units[0] = static_cast<uint16_t>(c);
+  } else {
+    units[0] = static_cast<uint16_t>(((c - 0x10000) >> 10) | 0xD800);
+    units[1] = static_cast<uint16_t>((c & 0x3FF) | 0xDC00);
+  }
+  return NLSSM_OK;
+}
+
+// ---- Buffer drivers ----------------------------------------------------------
+
+// Adapters so that the drivers take either a policy type or a pointer to a
+// function of the exported decoder or encoder signature.
+template <typename Policy>
+struct PolicyDecoder {
+  static constexpr bool kAsciiRuns = Policy::kAsciiRuns;
+  uint32_t operator()(const uint8_t *s, int64_t n, uint32_t *cp, int64_t *consumed) const {
+    return Policy::decode(s, n, cp, consumed);
+  }
+};
+template <typename Policy>
+struct PolicyEncoder {
+  static constexpr bool kFixedWidth4 = Policy::kFixedWidth4;
+  static constexpr bool kBigEndian = [] {
+    if constexpr (Policy::kFixedWidth4)
+      return Policy::kBigEndian;
+    else
+      return false;
+  }();
+  uint32_t operator()(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) const {
+    return Policy::encode(c, d, capacity, written);
+  }
+};
+struct PointerDecoder {
+  static constexpr bool kAsciiRuns = false;
+  NLSUTFDecoder fn;
+  uint32_t operator()(const uint8_t *s, int64_t n, uint32_t *cp, int64_t *consumed) const {
+    return static_cast<uint32_t>(fn(s, n, cp, consumed));
+  }
+};
+struct PointerEncoder {
+  static constexpr bool kFixedWidth4 = false;
+  NLSUTFEncoder fn;
+  uint32_t operator()(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) const {
+    return static_cast<uint32_t>(fn(c, d, capacity, written));
+  }
+};
+
+// Widens the run of ASCII bytes at `s` (at most `max` of them) into 32-bit
+// units at `d`, in big- or little-endian order; returns the run's length.
+int64_t widen_ascii_runs(const uint8_t *s, uint8_t *d, int64_t max, bool big_endian);
+
+// Decodes `source` character by character and encodes each code point into a
+// 4-byte slot of `destination`: at most capacity / 4 characters. Stops at the
+// first failing decode or encode and returns its status; `written` receives
+// 4 bytes per character stored.
+template <typename Decoder, typename Encoder>
+uint32_t convert_to_utf32(const uint8_t *source, int64_t source_bytes, uint8_t *destination,
+                          int64_t capacity, int64_t *written, Decoder decode, Encoder encode) {
+  if (source_bytes == 0) {
+    put(written, int64_t{0});
+    return NLSSM_OK;
+  }
+  const int64_t limit = capacity / 4;
+  int64_t chars = 0;
+  int64_t consumed = 0;
+  int64_t room = capacity;
+  uint32_t status = NLSSM_OK;
+  while (chars < limit && consumed < source_bytes) {
+    if constexpr (Decoder::kAsciiRuns && Encoder::kFixedWidth4) {
+      // A fixed 4-byte encoder never fails within the limit, so a run of
+      // ASCII bytes converts the same way in bulk.
+      const int64_t run = std::min(limit - chars, source_bytes - consumed);
+      if (run >= 16 && source[consumed] < 0x80) {
+        const int64_t done =
+            widen_ascii_runs(source + consumed, destination + 4 * chars, run, Encoder::kBigEndian);
+        consumed += done;
+        chars += done;
+        room -= 4 * done;
+        if (chars == limit || consumed == source_bytes) break;
+      }
+    }
+    uint32_t c = 0;
+    int64_t used = 0;
+    status = decode(source + consumed, source_bytes - consumed, &c, &used);
+    if (status != NLSSM_OK) break;
+    consumed += used;
+    int64_t out = 0;
+    status = encode(c, destination + 4 * chars, room, &out);
+    if (status != NLSSM_OK) break;
+    ++chars;
+    room -= out;
+  }
+  put(written, chars * 4);
+  return status;
+}
+
+// Reads 32-bit units from `source` through `decode` (whose status is not
+// consulted: a unit always yields a value) and encodes each into
+// `destination` until the units or the capacity run out.
+//
+// Some encoders write a short form without looking at the capacity; near the
+// end of the destination the driver lets them write into a scratch area and
+// copies the result only if it fits, so that nothing lands past the capacity:
+// a character that does not fit stops the loop as "destination too small".
+template <typename Decoder, typename Encoder>
+uint32_t convert_from_utf32(const uint8_t *source, int64_t source_bytes, uint8_t *destination,
+                            int64_t capacity, int64_t *written, Encoder encode, Decoder decode) {
+  if (source_bytes <= 3) {
+    put(written, int64_t{0});
+    return NLSSM_OK;
+  }
+  constexpr int64_t kScratch = 16;
+  const int64_t units = source_bytes / 4;
+  int64_t total = 0;
+  int64_t room = capacity;
+  uint32_t status = NLSSM_OK;
+  for (int64_t i = 0; i < units && room > 0; ++i) {
+    uint32_t c = 0;
+    int64_t used = 0;
+    decode(source + 4 * i, source_bytes - 4 * i, &c, &used);
+    int64_t out = 0;
+    if (room >= kScratch) {
+      status = encode(c, destination + total, room, &out);
+      if (status != NLSSM_OK) break;
+    } else {
+      uint8_t scratch[kScratch];
+      status = encode(c, scratch, room, &out);
+      if (status != NLSSM_OK) break;
+      if (out > room || out < 0) {
+        status = NLSSM_E_DEST_TOO_SMALL;
+        break;
+      }
+      std::memcpy(destination + total, scratch, static_cast<size_t>(out));
+    }
+    total += out;
+    room -= out;
+  }
+  put(written, total);
+  return status;
+}
+
+// ---- UTF-8 legality and length ------------------------------------------------
+
+// 1 when the `length` bytes form one well-formed UTF-8 character (lengths
+// other than 1..4 count as legal); `bad_index` receives the lowest failing
+// continuation position found, or `length`.
+inline int64_t is_legal_utf8(const uint8_t *s, int64_t length, int64_t *bad_index) {
+  put(bad_index, length);
+  if (length < 1 || length > 4) return 1;
+  int64_t legal = 1;
+  auto continuation = [](uint8_t b) { return b >= 0x80 && b <= 0xBF; };
+  if (length == 4 && !continuation(s[3])) {
+    put(bad_index, int64_t{3});
+    legal = 0;
+  }
+  if (length >= 3 && !continuation(s[2])) {
+    put(bad_index, int64_t{2});
+    legal = 0;
+  }
+  if (length >= 2) {
+    if (!continuation(s[1])) {
+      put(bad_index, int64_t{1});
+      legal = 0;
+    } else if ((s[0] == 0xE0 && s[1] < 0xA0) || (s[0] == 0xED && s[1] > 0x9F) ||
+               (s[0] == 0xF0 && s[1] < 0x90)) {
+      legal = 0;
+    }
+  }
+  if ((s[0] >= 0x80 && s[0] <= 0xC1) || s[0] > 0xF4) legal = 0;
+  return legal;
+}
+
+// Total UTF-8 bytes of `count` 32-bit characters: 1, 2, 3 or 4 each.
+constexpr int64_t utf8_length_of(uint32_t c) {
+  return c <= 0x7F ? 1 : c <= 0x7FF ? 2 : c < 0x10000 ? 3 : 4;
+}
+int64_t utf8_length_scalar(const uint32_t *chars, int64_t count);
+int64_t utf8_length_sse2(const uint32_t *chars, int64_t count);
+int64_t utf8_length_avx2(const uint32_t *chars, int64_t count);  // needs an AVX2 processor
+bool avx2_usable();
+int64_t utf8_length(const uint32_t *chars, int64_t count);  // best variant for this processor
+
+}  // namespace nlssm::unicode

@@ -1,0 +1,301 @@
+// The one-character codecs, drivers and helpers on hand-picked inputs,
+// including their deliberate leniencies.
+#include <gtest/gtest.h>
+#include <nlssm/nlssm.h>
+
+#include <random>
+#include <vector>
+
+#include "unicode/codec.hpp"
+
+namespace {
+
+struct Decoded {
+  int64_t status;
+  uint32_t cp;
+  int64_t consumed;
+};
+
+// Decodes from a buffer padded with continuation bytes, as far as a decoder
+// may read past what remains.
+Decoded decode(NLSUTFDecoder fn, std::vector<uint8_t> bytes, int64_t remaining = -1) {
+  if (remaining < 0) remaining = static_cast<int64_t>(bytes.size());
+  bytes.resize(bytes.size() + 8, 0x80);
+  Decoded d{0, 0, -1};
+  d.status = fn(bytes.data(), remaining, &d.cp, &d.consumed);
+  return d;
+}
+
+struct DecodeCase {
+  const char *what;
+  NLSUTFDecoder fn;
+  std::vector<uint8_t> bytes;
+  int64_t remaining;
+  uint32_t status, cp;
+  int64_t consumed;
+};
+
+class DecoderRules : public testing::TestWithParam<DecodeCase> {};
+
+TEST_P(DecoderRules, Decodes) {
+  const DecodeCase &c = GetParam();
+  const Decoded d = decode(c.fn, c.bytes, c.remaining);
+  EXPECT_EQ(d.status, c.status) << c.what;
+  EXPECT_EQ(d.cp, c.cp) << c.what;
+  EXPECT_EQ(d.consumed, c.consumed) << c.what;
+}
+
+constexpr uint32_t kOk = NLSSM_OK, kBad = NLSSM_E_ILL_FORMED, kShort = NLSSM_E_TRUNCATED_SEQUENCE;
+
+INSTANTIATE_TEST_SUITE_P(
+    Utf8, DecoderRules,
+    testing::Values(
+        DecodeCase{"ascii", UTF8_UTF32, {0x41}, -1, kOk, 0x41, 1},
+        DecodeCase{"bad continuation unchecked", UTF8_UTF32, {0xC3, 0x28}, -1, kOk, 0xE8, 2},
+        DecodeCase{"overlong E0 accepted", UTF8_UTF32, {0xE0, 0x80, 0x80}, -1, kOk, 0, 3},
+        DecodeCase{"surrogate accepted", UTF8_UTF32, {0xED, 0xA0, 0x80}, -1, kOk, 0xD800, 3},
+        DecodeCase{"four bytes", UTF8_UTF32, {0xF4, 0x8F, 0xBF, 0xBF}, -1, kOk, 0x10FFFF, 4},
+        DecodeCase{"lone continuation", UTF8_UTF32, {0x80}, -1, kBad, 0xFFFD, 1},
+        DecodeCase{"truncated", UTF8_UTF32, {0xF0, 0x9F}, 2, kShort, 0xFFFD, 2},
+        DecodeCase{"C0 skips one", UTF8_UTF32, {0xC0, 0x80}, -1, kBad, 0xFFFD, 2},
+        DecodeCase{
+            "skip stops at non-continuation", UTF8_UTF32, {0xF8, 0x80, 0x41}, -1, kBad, 0xFFFD, 2},
+        // The skip runs past the bytes remaining (the padding is 0x80).
+        DecodeCase{"skip ignores remaining", UTF8_UTF32, {0xFC}, 1, kBad, 0xFFFD, 6},
+        DecodeCase{"F5 announces four", UTF8_UTF32, {0xF5}, 1, kBad, 0xFFFD, 4}));
+
+INSTANTIATE_TEST_SUITE_P(
+    Utf16, DecoderRules,
+    testing::Values(
+        DecodeCase{"BE unit", UTF16_UTF32, {0x12, 0x34}, -1, kOk, 0x1234, 2},
+        DecodeCase{"LE unit", UTF16_UTF32_SWAP, {0x12, 0x34}, -1, kOk, 0x3412, 2},
+        DecodeCase{"BE pair", UTF16_UTF32, {0xD8, 0x3D, 0xDE, 0x00}, -1, kOk, 0x1F600, 4},
+        DecodeCase{"LE pair", UTF16_UTF32_SWAP, {0x3D, 0xD8, 0x00, 0xDE}, -1, kOk, 0x1F600, 4},
+        DecodeCase{"unpaired high swallows next",
+                   UTF16_UTF32,
+                   {0xD8, 0x00, 0x00, 0x41},
+                   -1,
+                   kBad,
+                   0xFFFD,
+                   4},
+        DecodeCase{"lone low", UTF16_UTF32_SWAP, {0x00, 0xDC}, -1, kBad, 0xFFFD, 2},
+        DecodeCase{"high with one byte left", UTF16_UTF32, {0xD8, 0x00}, 1, kShort, 0xFFFD, 1},
+        // The truncation bound is 2 bytes, so the low unit is read past it.
+        DecodeCase{"high with two bytes left",
+                   UTF16_UTF32,
+                   {0xD8, 0x00, 0xDC, 0x00},
+                   2,
+                   kOk,
+                   0x10000,
+                   4}));
+
+INSTANTIATE_TEST_SUITE_P(
+    Utf32, DecoderRules,
+    testing::Values(
+        DecodeCase{"BE", COPY_UTF32b, {1, 2, 3, 4}, -1, kOk, 0x01020304, 4},
+        DecodeCase{"native", COPY_UTF32b_SWAP, {1, 2, 3, 4}, -1, kOk, 0x04030201, 4},
+        DecodeCase{"any value", COPY_UTF32b, {0xFF, 0xFF, 0xFF, 0xFF}, 1, kOk, 0xFFFFFFFF, 4}));
+
+struct EncodeCase {
+  const char *what;
+  NLSUTFEncoder fn;
+  uint32_t cp;
+  int64_t capacity;
+  uint32_t status;
+  std::vector<uint8_t> bytes;  // written bytes; their count is `written`
+};
+
+class EncoderRules : public testing::TestWithParam<EncodeCase> {};
+
+TEST_P(EncoderRules, Encodes) {
+  const EncodeCase &c = GetParam();
+  std::vector<uint8_t> out(8, 0xEE);
+  int64_t written = -1;
+  EXPECT_EQ(c.fn(c.cp, out.data(), c.capacity, &written), c.status) << c.what;
+  const int64_t expected = c.bytes.size();
+  if (c.status == NLSSM_OK || expected > 0) {
+    EXPECT_EQ(written, expected) << c.what;
+  }
+  EXPECT_EQ(std::vector<uint8_t>(out.begin(), out.begin() + c.bytes.size()), c.bytes) << c.what;
+  EXPECT_EQ(out[c.bytes.size()], 0xEE) << c.what << ": wrote past the character";
+}
+
+constexpr uint32_t kFull = NLSSM_E_DEST_TOO_SMALL;
+
+INSTANTIATE_TEST_SUITE_P(
+    Encoders, EncoderRules,
+    testing::Values(
+        EncodeCase{"ascii needs no capacity", UTF32_UTF8, 0x7F, 0, kOk, {0x7F}},
+        EncodeCase{"two bytes in one", UTF32_UTF8, 0x80, 1, kFull, {}},
+        EncodeCase{"three", UTF32_UTF8, 0x20AC, 3, kOk, {0xE2, 0x82, 0xAC}},
+        EncodeCase{"four", UTF32_UTF8, 0x10FFFF, 4, kOk, {0xF4, 0x8F, 0xBF, 0xBF}},
+        EncodeCase{"beyond Unicode", UTF32_UTF8, 0x200000, 4, kOk, {0xF8, 0x80, 0x80, 0x80}},
+        EncodeCase{"unit surrogate alone", UTF16_UTF8, 0xD800, 3, kOk, {0xED, 0xA0, 0x80}},
+        EncodeCase{"unit takes low 16 bits", UTF16_UTF8, 0x10041, 3, kOk, {0x41}},
+        EncodeCase{"UTF-32 BE", COPY_UTF32, 0x1F600, 4, kOk, {0, 1, 0xF6, 0}},
+        EncodeCase{"UTF-32 LE", COPY_UTF32_SWAP, 0x1F600, 4, kOk, {0, 0xF6, 1, 0}},
+        EncodeCase{"UTF-32 too small", COPY_UTF32_SWAP, 0x41, 3, kFull, {}},
+        EncodeCase{"unit LE, no check", UTF32_UTF16, 0x1F600, 0, kOk, {0x00, 0xF6}},
+        EncodeCase{"unit BE, no check", UTF32_UTF16_SWAP, 0x1F600, 0, kOk, {0xF6, 0x00}},
+        EncodeCase{"pair LE", UTF32_UTF16s, 0x1F600, 4, kOk, {0x3D, 0xD8, 0x00, 0xDE}},
+        EncodeCase{"pair BE", UTF32_UTF16s_SWAP, 0x1F600, 4, kOk, {0xD8, 0x3D, 0xDE, 0x00}},
+        EncodeCase{"BMP LE, no check", UTF32_UTF16s, 0x20AC, 0, kOk, {0xAC, 0x20}}));
+
+TEST(EncoderRules, UnfittedPairLeavesWrittenUntouched) {
+  uint8_t out[4];
+  int64_t written = 77;
+  EXPECT_EQ(UTF32_UTF16s_SWAP(0x10000, out, 3, &written), NLSSM_E_DEST_TOO_SMALL);
+  EXPECT_EQ(written, 77);
+}
+
+TEST(Utf8ToUtf16, NativeUnitsAndOneReplacementOnAnyFailure) {
+  uint16_t units[2] = {0, 0};
+  int64_t consumed = 0;
+  const uint8_t emoji[] = {0xF0, 0x9F, 0x98, 0x80};
+  EXPECT_EQ(UTF8_UTF16(emoji, 4, units, &consumed), NLSSM_OK);
+  EXPECT_EQ(units[0], 0xD83D);
+  EXPECT_EQ(units[1], 0xDE00);
+  EXPECT_EQ(consumed, 4);
+  units[1] = 0x1234;
+  EXPECT_EQ(UTF8_UTF16(emoji, 3, units, &consumed), NLSSM_E_ILL_FORMED);  // truncated
+  EXPECT_EQ(units[0], 0xFFFD);
+  EXPECT_EQ(units[1], 0x1234);
+  EXPECT_EQ(consumed, 3);
+}
+
+TEST(ByteHelpers, EachKeepsItsOwnOrder) {
+  const uint8_t b[] = {0x12, 0x34, 0x56, 0x78};
+  EXPECT_EQ(Byte2Word(b), 0x3412);
+  EXPECT_EQ(Byte2Word_swap(b), 0x1234);
+  EXPECT_EQ(Byte2DWord(b), 0x78563412u);
+  EXPECT_EQ(Byte2DWord_swap(b), 0x12345678u);
+  EXPECT_EQ(BYTE_UTF16_UTF32(b), 0x1234u);
+  EXPECT_EQ(BYTE_UTF16_UTF32_SWAP(b), 0x3412u);
+}
+
+TEST(CopyUtf, CopiesWhatFitsAndReportsTheRest) {
+  const uint8_t src[] = {1, 2, 3, 4, 5};
+  uint8_t dst[6] = {};
+  int64_t written = -1;
+  EXPECT_EQ(COPY_UTF(src, 5, dst, 3, &written), NLSSM_E_DEST_TOO_SMALL);
+  EXPECT_EQ(written, 3);
+  EXPECT_EQ(dst[2], 3);
+  EXPECT_EQ(dst[3], 0);
+  EXPECT_EQ(COPY_UTF(src, 5, dst, 6, &written), NLSSM_OK);
+  EXPECT_EQ(written, 5);
+  EXPECT_EQ(COPY_UTF(src, 5, dst, -1, &written), NLSSM_E_DEST_TOO_SMALL);
+  EXPECT_EQ(written, 0);
+}
+
+// A decoder the driver does not know, so that the generic loop runs.
+int64_t utf8_via_pointer(const uint8_t *s, int64_t n, uint32_t *cp, int64_t *consumed) {
+  return UTF8_UTF32(s, n, cp, consumed);
+}
+
+class ToUtf32Driver : public testing::TestWithParam<NLSUTFDecoder> {};
+
+TEST_P(ToUtf32Driver, StopsAtLimitOrFailureAndCountsStoredCharacters) {
+  const NLSUTFDecoder dec = GetParam();
+  std::vector<uint8_t> text(44, 'a');  // long enough for the ASCII bulk path
+  text[40] = 0xC3;
+  text[41] = 0xA9;
+  text[42] = 0x80;
+  std::vector<uint32_t> out(64, 0xEEEEEEEE);
+  int64_t written = -1;
+  // Capacity 7 holds one character.
+  EXPECT_EQ(ConvertToUTF32(text.data(), text.size(), out.data(), 7, &written, dec, COPY_UTF32_SWAP),
+            NLSSM_OK);
+  EXPECT_EQ(written, 4);
+  EXPECT_EQ(out[1], 0xEEEEEEEE);
+  // The stray 0x80 stops the loop; its replacement is not stored.
+  EXPECT_EQ(ConvertToUTF32(text.data(), text.size(), out.data(), 256, &written, dec, COPY_UTF32),
+            NLSSM_E_ILL_FORMED);
+  EXPECT_EQ(written, 41 * 4);
+  EXPECT_EQ(out[39], 0x61000000u);
+  EXPECT_EQ(out[40], 0xE9000000u);
+  EXPECT_EQ(out[41], 0xEEEEEEEE);
+  // Input that ends inside a sequence.
+  EXPECT_EQ(ConvertToUTF32(text.data(), 41, out.data(), 256, &written, dec, COPY_UTF32_SWAP),
+            NLSSM_E_TRUNCATED_SEQUENCE);
+  EXPECT_EQ(written, 40 * 4);
+  EXPECT_EQ(ConvertToUTF32(text.data(), 0, out.data(), 256, &written, dec, COPY_UTF32_SWAP),
+            NLSSM_OK);
+  EXPECT_EQ(written, 0);
+}
+
+INSTANTIATE_TEST_SUITE_P(KnownAndGeneric, ToUtf32Driver,
+                         testing::Values(UTF8_UTF32, utf8_via_pointer));
+
+TEST(FromUtf32Driver, StopsWhenTheCapacityIsUsedUp) {
+  const uint32_t text[] = {'a', 0xE9, 'b'};
+  uint8_t out[8];
+  int64_t written = -1;
+  EXPECT_EQ(ConvertFromUTF32(text, 12, out, 2, &written, UTF32_UTF8, COPY_UTF32b_SWAP),
+            NLSSM_E_DEST_TOO_SMALL);
+  EXPECT_EQ(written, 1);
+  EXPECT_EQ(ConvertFromUTF32(text, 12, out, 3, &written, UTF32_UTF8, COPY_UTF32b_SWAP), NLSSM_OK);
+  EXPECT_EQ(written, 3);  // stops with the capacity spent, before 'b'
+  EXPECT_EQ(ConvertFromUTF32(text, 3, out, 8, &written, UTF32_UTF8, COPY_UTF32b_SWAP), NLSSM_OK);
+  EXPECT_EQ(written, 0);
+}
+
+TEST(FromUtf32Driver, UncheckedUnitWritesStayInsideTheCapacity) {
+  const uint32_t text[] = {'a', 'b', 'c'};
+  for (NLSUTFEncoder enc : {UTF32_UTF16, UTF32_UTF16_SWAP, UTF32_UTF16s}) {
+    uint8_t out[6] = {0, 0, 0, 0xEE, 0xEE, 0xEE};
+    int64_t written = -1;
+    EXPECT_EQ(ConvertFromUTF32(text, 12, out, 3, &written, enc, COPY_UTF32b_SWAP),
+              NLSSM_E_DEST_TOO_SMALL);
+    EXPECT_EQ(written, 2);
+    EXPECT_EQ(out[2], 0);
+    EXPECT_EQ(out[3], 0xEE);
+  }
+}
+
+struct LegalCase {
+  std::vector<uint8_t> bytes;
+  int64_t length, legal, index;
+};
+
+class IsLegalUtf8Rules : public testing::TestWithParam<LegalCase> {};
+
+TEST_P(IsLegalUtf8Rules, JudgesAndLocates) {
+  const LegalCase &c = GetParam();
+  int64_t index = -1;
+  EXPECT_EQ(isLegalUTF8(c.bytes.data(), c.length, &index), c.legal);
+  EXPECT_EQ(index, c.index);
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Cases, IsLegalUtf8Rules,
+    testing::Values(LegalCase{{0xFC, 0x80, 0x80, 0x80, 0x80}, 5, 1, 5},
+                    LegalCase{{0xF4, 0x90, 0x80, 0x80}, 4, 1, 4},  // no bound after F4
+                    LegalCase{{0xED, 0xA0, 0x80}, 3, 0, 3}, LegalCase{{0xE0, 0x9F, 0x80}, 3, 0, 3},
+                    LegalCase{{0xF0, 0x41, 0x41, 0x41}, 4, 0, 1},  // lowest position wins
+                    LegalCase{{0xF0, 0x90, 0x80, 0x41}, 4, 0, 3}, LegalCase{{0xC1, 0x80}, 2, 0, 2},
+                    LegalCase{{0x80}, 1, 0, 1}, LegalCase{{0x7F}, 1, 1, 1}));
+
+TEST(Utf8Length, VectorPathsMatchTheScalarRule) {
+  namespace u = nlssm::unicode;
+  std::mt19937 rng(7);
+  const uint32_t edges[] = {0,       0x7F,     0x80,       0x7FF,      0x800,      0xFFFF,
+                            0x10000, 0x10FFFF, 0x7FFFFFFF, 0x80000000, 0xFFFFFFFF, 0x8000007F};
+  std::vector<uint32_t> chars(300);
+  for (auto &c : chars) c = rng() % 3 == 0 ? edges[rng() % 12] : rng() >> (rng() % 32);
+  for (size_t start = 0; start < 9; ++start) {
+    for (int64_t count : {0, 1, 3, 4, 7, 8, 15, 16, 17, 31, 33, 100, 291}) {
+      const uint32_t *p = chars.data() + start;
+      const int64_t expected = u::utf8_length_scalar(p, count);
+      EXPECT_EQ(u::utf8_length_sse2(p, count), expected);
+      if (u::avx2_usable()) {
+        EXPECT_EQ(u::utf8_length_avx2(p, count), expected);
+      }
+      EXPECT_EQ(GET_UTF8_LEN_FROM_QVCHAR(p, count), expected);
+    }
+  }
+  EXPECT_EQ(GET_UTF8_LEN_FROM_QVCHAR(nullptr, 5), 0);
+  EXPECT_EQ(GET_UTF8_LEN_FROM_QVCHAR(edges, -1), 0);
+  EXPECT_EQ(GET_UTF8_LEN_FROM_QVCHAR(edges, 12), 1 + 1 + 2 + 2 + 3 + 3 + 4 * 6);
+}
+
+}  // namespace
