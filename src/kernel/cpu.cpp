@@ -1,0 +1,44 @@
+#include "kernel/cpu.hpp"
+
+namespace kernel::cpu {
+namespace {
+
+enum Feature : uint32_t { kAvx2 = 1u << 0 };
+
+uint32_t detect() noexcept {
+  // The run-time library fills its processor model in a constructor; a
+  // dispatch that runs from another constructor may come first.
+  __builtin_cpu_init();
+  uint32_t features = 0;
+  if (__builtin_cpu_supports("avx2")) features |= kAvx2;
+  return features;
+}
+
+uint32_t features() noexcept {
+  static const uint32_t detected = detect();
+  return detected;
+}
+
+}  // namespace
+
+bool supports(Isa isa) noexcept {
+  switch (isa) {
+    case Isa::sse2:
+      return true;
+    case Isa::avx2:
+      return (features() & kAvx2) != 0;
+  }
+  return false;
+}
+
+const char *name(Isa isa) noexcept {
+  switch (isa) {
+    case Isa::sse2:
+      return "sse2";
+    case Isa::avx2:
+      return "avx2";
+  }
+  return "?";
+}
+
+}  // namespace kernel::cpu

@@ -1,0 +1,91 @@
+// Processor features and run-time selection of instruction-set variants.
+//
+// A hot path that has vector variants gathers its functions in a table type
+// (one function pointer per operation), defines one constant table per
+// instruction set in its own translation unit, and selects among them with a
+// Dispatch object:
+//
+//   inline constinit kernel::cpu::Dispatch<MyOps, 2> my_ops{
+//       {{{Isa::avx2, &avx2::kMyOps}, {Isa::sse2, &sse2::kMyOps}}}};
+//   my_ops.get().operation(...);
+//
+// The variant for a wider instruction set lives in a translation unit whose
+// code sits between NLSSM_TARGET_AVX2_BEGIN and NLSSM_TARGET_AVX2_END, so the
+// rest of the module stays at the x86-64 baseline (SSE2).
+#pragma once
+
+#include <array>
+#include <atomic>
+#include <cstddef>
+#include <cstdint>
+#include <span>
+
+namespace kernel::cpu {
+
+// Instruction sets a hot path may have a variant for, weakest first.
+enum class Isa : uint8_t { sse2, avx2 };
+
+inline constexpr std::array<Isa, 2> kAllIsas{Isa::sse2, Isa::avx2};
+
+// True when this processor and operating system run code built for `isa`.
+// Detected once; safe to call from any thread at any time.
+bool supports(Isa isa) noexcept;
+const char *name(Isa isa) noexcept;
+
+template <typename Table>
+struct Variant {
+  Isa isa;
+  const Table *table;
+};
+
+// A set of variants of one operation table, best first. The first variant the
+// processor supports is chosen on first use and kept. Threads that race on
+// the first use all store the same pointer, so a relaxed atomic is enough:
+// the tables are constants and publish no other data.
+template <typename Table, std::size_t N>
+class Dispatch {
+ public:
+  constexpr explicit Dispatch(const std::array<Variant<Table>, N> &variants)
+      : variants_(variants) {}
+
+  const Table &get() const noexcept {
+    const Table *table = chosen_.load(std::memory_order_relaxed);
+    if (table == nullptr) [[unlikely]]
+      table = choose();
+    return *table;
+  }
+
+  // Every variant, best first; tests and benchmarks filter by supports().
+  std::span<const Variant<Table>, N> variants() const noexcept { return variants_; }
+
+ private:
+  const Table *choose() const noexcept {
+    const Table *table = variants_[N - 1].table;
+    for (const auto &variant : variants_) {
+      if (supports(variant.isa)) {
+        table = variant.table;
+        break;
+      }
+    }
+    chosen_.store(table, std::memory_order_relaxed);
+    return table;
+  }
+
+  std::array<Variant<Table>, N> variants_;
+  mutable std::atomic<const Table *> chosen_{nullptr};
+};
+
+}  // namespace kernel::cpu
+
+// Compile the functions between these markers for AVX2 (templates included,
+// so a template over an AVX2 vector policy must be defined inside a region).
+// Headers with inline non-template functions must be included before the
+// region, or their out-of-line copies could be built for the wrong processor.
+#if defined(__clang__)
+#define NLSSM_TARGET_AVX2_BEGIN \
+  _Pragma("clang attribute push(__attribute__((target(\"avx2\"))), apply_to = function)")
+#define NLSSM_TARGET_AVX2_END _Pragma("clang attribute pop")
+#else
+#define NLSSM_TARGET_AVX2_BEGIN _Pragma("GCC push_options") _Pragma("GCC target(\"avx2\")")
+#define NLSSM_TARGET_AVX2_END _Pragma("GCC pop_options")
+#endif

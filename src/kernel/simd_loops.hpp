@@ -1,0 +1,92 @@
+// The kernel's vector loops, written once over a vector policy V (simd.hpp):
+// a scalar head up to the first V-aligned address, aligned whole registers,
+// a scalar tail. Every template here depends on V, so each instantiation
+// belongs to one instruction set; an instruction-set translation unit
+// includes this header after all others and inside its target region.
+#pragma once
+
+#include <cstdint>
+
+#include "kernel/scalar.hpp"
+#include "kernel/simd.hpp"
+
+namespace kernel::simd {
+
+// Elements before the first V-aligned element, at most n. A pointer that is
+// not aligned to its element size never reaches alignment: all scalar.
+template <class V, typename T>
+inline int64_t head_elements(const T *p, int64_t n) {
+  const auto misalign = static_cast<int64_t>(reinterpret_cast<uintptr_t>(p) & (V::kBytes - 1));
+  if (misalign % static_cast<int64_t>(sizeof(T)) != 0) return n;
+  const int64_t head = misalign == 0 ? 0 : (V::kBytes - misalign) / static_cast<int64_t>(sizeof(T));
+  return head < n ? head : n;
+}
+
+template <class V>
+void flip_case(uint8_t *p, int64_t n, uint8_t lo) {
+  int64_t i = head_elements<V>(p, n);
+  scalar::flip_case(p, i, lo);
+  for (; i + 2 * V::kBytes <= n; i += 2 * V::kBytes) {
+    const auto a = V::load(p + i), b = V::load(p + i + V::kBytes);
+    V::store(p + i, V::flip_case(a, lo));
+    V::store(p + i + V::kBytes, V::flip_case(b, lo));
+  }
+  if (i + V::kBytes <= n) {
+    V::store(p + i, V::flip_case(V::load(p + i), lo));
+    i += V::kBytes;
+  }
+  scalar::flip_case(p + i, n - i, lo);
+}
+
+// Fills larger than this write around the caches: they would only evict
+// everything else and pay for reading lines that are about to be replaced.
+inline constexpr int64_t kStreamFillBytes = int64_t{16} << 20;
+
+template <class V, typename T>
+void fill(T *p, T value, int64_t n) {
+  constexpr int64_t step = V::kBytes / sizeof(T);
+  int64_t i = head_elements<V>(p, n);
+  scalar::mem_fill(p, value, i);
+  const auto v = V::template splat<T>(value);
+  if (i < n && (n - i) * static_cast<int64_t>(sizeof(T)) >= kStreamFillBytes) {
+    for (; i + step <= n; i += step) V::stream(p + i, v);
+    V::stream_fence();
+  }
+  for (; i + 4 * step <= n; i += 4 * step) {
+    V::store(p + i, v);
+    V::store(p + i + step, v);
+    V::store(p + i + 2 * step, v);
+    V::store(p + i + 3 * step, v);
+  }
+  for (; i + step <= n; i += step) V::store(p + i, v);
+  scalar::mem_fill(p + i, value, n - i);
+}
+
+// Index of the first element equal to (Equal) or different from the value.
+template <class V, bool Equal, typename T>
+int64_t find(const T *p, int64_t n, T value) {
+  constexpr int64_t step = V::kBytes / sizeof(T);
+  constexpr typename V::Mask none = Equal ? 0 : V::kAllBytes;
+  int64_t i = head_elements<V>(p, n);
+  if (const int64_t r = scalar::find<Equal>(p, i, value); r >= 0) return r;
+  const auto key = V::template splat<T>(value);
+  // Four registers per test while nothing is found; the hit itself is
+  // located by the one-register loop below.
+  for (; i + 4 * step <= n; i += 4 * step) {
+    const auto e0 = V::template eq<T>(V::load(p + i), key);
+    const auto e1 = V::template eq<T>(V::load(p + i + step), key);
+    const auto e2 = V::template eq<T>(V::load(p + i + 2 * step), key);
+    const auto e3 = V::template eq<T>(V::load(p + i + 3 * step), key);
+    const auto all = Equal ? V::either(V::either(e0, e1), V::either(e2, e3))
+                           : V::both(V::both(e0, e1), V::both(e2, e3));
+    if (V::mask(all) != none) break;
+  }
+  for (; i + step <= n; i += step) {
+    const typename V::Mask hits = V::mask(V::template eq<T>(V::load(p + i), key)) ^ none;
+    if (hits != 0) return i + __builtin_ctz(hits) / static_cast<int>(sizeof(T));
+  }
+  if (const int64_t r = scalar::find<Equal>(p + i, n - i, value); r >= 0) return i + r;
+  return -1;
+}
+
+}  // namespace kernel::simd

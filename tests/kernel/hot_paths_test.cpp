@@ -1,0 +1,162 @@
+// Every vector variant the processor runs, and the exported functions that
+// dispatch to them, against the scalar rules: each misalignment of 0..31
+// bytes, each length 0..300, with the bytes around the range left intact.
+#include <gtest/gtest.h>
+
+#include <array>
+#include <random>
+#include <string>
+#include <vector>
+
+#include "kernel/hot.hpp"
+#include "kernel/scalar.hpp"
+#include "nlssm/nlssm.h"
+
+namespace {
+
+struct Path {
+  std::string name;
+  kernel::HotOps ops;
+};
+
+std::vector<Path> paths() {
+  std::vector<Path> out;
+  for (const auto &variant : kernel::hot_ops.variants())
+    if (kernel::cpu::supports(variant.isa))
+      out.push_back({kernel::cpu::name(variant.isa), *variant.table});
+  out.push_back(
+      {"exported", {skStrUp, skStrLow, skMemSet, skMemTSet, skMemScan, skMemNScan, skMemTNScan}});
+  return out;
+}
+
+constexpr int64_t kMaxLength = 300;
+
+// Calls body(region, length, expected) for every misalignment and length;
+// region and expected lie in two copies of a 64-byte-aligned arena of
+// random elements, and after body both copies must agree everywhere.
+template <typename T, typename Body>
+void sweep(Body &&body) {
+  constexpr int64_t guard = 64 / sizeof(T), shifts = 32 / sizeof(T);
+  alignas(64) std::array<T, 2 * guard + shifts + kMaxLength> arena, expected;
+  std::mt19937 rng(12345);
+  for (int64_t shift = 0; shift < shifts; ++shift) {
+    for (int64_t length = 0; length <= kMaxLength; ++length) {
+      for (auto &x : arena) x = static_cast<T>(rng());
+      expected = arena;
+      body(arena.data() + guard + shift, length, expected.data() + guard + shift);
+      ASSERT_TRUE(arena == expected)
+          << "misalignment " << shift * sizeof(T) << ", length " << length;
+    }
+  }
+}
+
+// A find over `length` elements of `fill` with `other` at `hit` and beyond,
+// and `other` in the surrounding elements too, so reading outside the range
+// gives a wrong answer.
+template <typename T, typename Find>
+void check_find(Find find, T fill, T other) {
+  sweep<T>([&](T *region, int64_t length, T *expected) {
+    for (int64_t hit :
+         {length, int64_t{0}, length / 2, length - 1, (length * 7 + 3) % (length + 1)}) {
+      if (hit < 0) continue;
+      for (T *p : {region, expected}) {
+        std::fill(p - 64 / sizeof(T), p + length + 64 / sizeof(T), other);
+        std::fill(p, p + length, fill);
+        if (hit < length) std::fill(p + hit, p + (hit + 3 < length ? hit + 3 : length), other);
+      }
+      ASSERT_EQ(find(region, length), hit < length ? hit : -1) << "hit at " << hit;
+    }
+  });
+}
+
+class HotPathTest : public testing::TestWithParam<Path> {};
+
+TEST_P(HotPathTest, CaseMappingChangesAsciiLettersOnly) {
+  const auto &ops = GetParam().ops;
+  sweep<uint8_t>([&](uint8_t *p, int64_t n, uint8_t *e) {
+    ops.str_up(p, n);
+    kernel::scalar::str_up(e, n);
+  });
+  sweep<uint8_t>([&](uint8_t *p, int64_t n, uint8_t *e) {
+    ops.str_low(p, n);
+    kernel::scalar::str_low(e, n);
+  });
+  // Every byte value, including those next to the letter ranges.
+  std::array<uint8_t, 256> all, upper;
+  for (int i = 0; i < 256; ++i) all[i] = upper[i] = static_cast<uint8_t>(i);
+  ops.str_up(upper.data(), 256);
+  for (int i = 0; i < 256; ++i) EXPECT_EQ(upper[i], i >= 'a' && i <= 'z' ? i - 32 : i) << i;
+  ops.str_low(upper.data(), 256);
+  for (int i = 0; i < 256; ++i) EXPECT_EQ(upper[i], i >= 'A' && i <= 'Z' ? i + 32 : all[i]) << i;
+}
+
+TEST_P(HotPathTest, FillsWriteExactlyTheRange) {
+  const auto &ops = GetParam().ops;
+  sweep<uint8_t>([&](uint8_t *p, int64_t n, uint8_t *e) {
+    ops.mem_set(p, 0x5a, n);
+    kernel::scalar::mem_set(e, 0x5a, n);
+  });
+  sweep<uint32_t>([&](uint32_t *p, int64_t n, uint32_t *e) {
+    ops.mem_tset(p, 0xdeadbeef, n);
+    kernel::scalar::mem_tset(e, 0xdeadbeef, n);
+  });
+}
+
+TEST_P(HotPathTest, ScansFindTheFirstHitInsideTheRange) {
+  const auto &ops = GetParam().ops;
+  check_find<uint8_t>([&](const uint8_t *p, int64_t n) { return ops.mem_scan(p, n, 0x80); }, 0x00,
+                      0x80);
+  check_find<uint8_t>([&](const uint8_t *p, int64_t n) { return ops.mem_nscan(p, n, 0x20); }, 0x20,
+                      0xa0);
+  check_find<uint32_t>(
+      [&](const uint32_t *p, int64_t n) { return ops.mem_tnscan(p, n, 0x00200020); }, 0x00200020,
+      0x00200021);
+  // An element differing only in its top byte, and a long range.
+  std::vector<uint32_t> units(5000, 7);
+  units[4321] = 0x80000007;
+  EXPECT_EQ(ops.mem_tnscan(units.data(), 5000, 7), 4321);
+  std::vector<uint8_t> bytes(70000, 'x');
+  bytes[65537] = 'y';
+  EXPECT_EQ(ops.mem_scan(bytes.data(), 70000, 'y'), 65537);
+  EXPECT_EQ(ops.mem_nscan(bytes.data(), 70000, 'x'), 65537);
+}
+
+INSTANTIATE_TEST_SUITE_P(Kernel, HotPathTest, testing::ValuesIn(paths()),
+                         [](const auto &info) { return info.param.name; });
+
+// skMemNot answers with the index of the first differing element, or -2
+// when it claims a difference that is not there.
+template <typename T, typename Not>
+int64_t first_difference(Not not_fn, T value, const T *p, int64_t n) {
+  if (not_fn(value, p, n)) return -1;
+  const int64_t r = kernel::scalar::find<false>(p, n, value);
+  return r >= 0 ? r : -2;
+}
+
+TEST(HotPaths, AllEqualTestsAgreeWithScans) {
+  check_find<uint8_t>(
+      [](const uint8_t *p, int64_t n) { return first_difference<uint8_t>(skMemNot, 0x41, p, n); },
+      0x41, 0x42);
+  check_find<uint32_t>(
+      [](const uint32_t *p, int64_t n) { return first_difference<uint32_t>(skMemTNot, 9, p, n); },
+      9, 0x80000009);
+}
+
+TEST(HotPaths, ExportedFunctionsRejectNullAndNegativeLengths) {
+  uint8_t b[4] = {'a', 'b', 'c', 'd'};
+  skStrUp(nullptr, 4);
+  skStrUp(b, -1);
+  skMemSet(nullptr, 1, 4);
+  skMemSet(b, 1, -4);
+  skMemTSet(nullptr, 1, 4);
+  EXPECT_EQ(std::string(b, b + 4), "abcd");
+  EXPECT_EQ(skMemScan(nullptr, 4, 0), -1);
+  EXPECT_EQ(skMemScan(b, 0, 'a'), -1);
+  EXPECT_EQ(skMemNScan(nullptr, 4, 0), -1);
+  EXPECT_EQ(skMemTNScan(nullptr, 4, 0), -1);
+  EXPECT_EQ(skMemNot(0, b, 0), 1);
+  EXPECT_EQ(skMemNot(0, nullptr, 4), 0);
+  EXPECT_EQ(skMemTNot(0, nullptr, 4), 0);
+}
+
+}  // namespace
