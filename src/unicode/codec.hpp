@@ -28,35 +28,35 @@ template <Order O>
 inline constexpr bool kIsBig = O == Order::big ||
                                (O == Order::native && std::endian::native == std::endian::big);
 
+// True when units of order O must be byte-swapped on this machine.
+template <Order O>
+inline constexpr bool kSwaps = kIsBig<O> != (std::endian::native == std::endian::big);
+
 template <Order O>
 inline uint16_t load16(const uint8_t *p) {
-  if constexpr (kIsBig<O>)
-    return static_cast<uint16_t>(p[0] << 8 | p[1]);
-  else
-    return static_cast<uint16_t>(p[1] << 8 | p[0]);
+  uint16_t v;
+  std::memcpy(&v, p, 2);
+  return kSwaps<O> ? __builtin_bswap16(v) : v;
 }
 
 template <Order O>
 inline uint32_t load32(const uint8_t *p) {
-  if constexpr (kIsBig<O>)
-    return uint32_t{p[0]} << 24 | uint32_t{p[1]} << 16 | uint32_t{p[2]} << 8 | p[3];
-  else
-    return uint32_t{p[3]} << 24 | uint32_t{p[2]} << 16 | uint32_t{p[1]} << 8 | p[0];
+  uint32_t v;
+  std::memcpy(&v, p, 4);
+  return kSwaps<O> ? __builtin_bswap32(v) : v;
 }
 
 template <Order O>
 inline void store16(uint8_t *p, uint32_t v) {
-  const uint8_t hi = static_cast<uint8_t>(v >> 8), lo = static_cast<uint8_t>(v);
-  p[0] = kIsBig<O> ? hi : lo;
-  p[1] = kIsBig<O> ? lo : hi;
+  uint16_t u = static_cast<uint16_t>(v);
+  if constexpr (kSwaps<O>) u = __builtin_bswap16(u);
+  std::memcpy(p, &u, 2);
 }
 
 template <Order O>
 inline void store32(uint8_t *p, uint32_t v) {
-  for (int i = 0; i < 4; ++i) {
-    const int shift = kIsBig<O> ? 24 - 8 * i : 8 * i;
-    p[i] = static_cast<uint8_t>(v >> shift);
-  }
+  if constexpr (kSwaps<O>) v = __builtin_bswap32(v);
+  std::memcpy(p, &v, 4);
 }
 
 template <typename T>
@@ -71,7 +71,7 @@ inline void put(T *out, T value) {
 // After an invalid lead, continuation bytes are skipped up to the length the
 // lead announces, without regard to the bytes remaining.
 struct Utf8Decoder {
-  static constexpr bool kAsciiRuns = true;  // one byte per character below 0x80
+  static constexpr bool kBulkToUtf32 = true;  // has utf8_to_utf32_bulk
 
   static inline uint32_t decode(const uint8_t *s, int64_t remaining, uint32_t *cp,
                                 int64_t *consumed) {
@@ -107,7 +107,7 @@ struct Utf8Decoder {
 // from the bytes that follow.
 template <Order O>
 struct Utf16Decoder {
-  static constexpr bool kAsciiRuns = false;
+  static constexpr bool kBulkToUtf32 = false;
 
   static inline uint32_t decode(const uint8_t *s, int64_t remaining, uint32_t *cp,
                                 int64_t *consumed) {
@@ -137,7 +137,7 @@ struct Utf16Decoder {
 // One 32-bit unit in the given order; never fails.
 template <Order O>
 struct Utf32Decoder {
-  static constexpr bool kAsciiRuns = false;
+  static constexpr bool kBulkToUtf32 = false;
 
   static inline uint32_t decode(const uint8_t *s, int64_t, uint32_t *cp, int64_t *consumed) {
     put(cp, load32<O>(s));
@@ -257,7 +257,7 @@ inline uint32_t utf8_to_utf16_units(const uint8_t *s, int64_t remaining, uint16_
 // function of the exported decoder or encoder signature.
 template <typename Policy>
 struct PolicyDecoder {
-  static constexpr bool kAsciiRuns = Policy::kAsciiRuns;
+  static constexpr bool kBulkToUtf32 = Policy::kBulkToUtf32;
   uint32_t operator()(const uint8_t *s, int64_t n, uint32_t *cp, int64_t *consumed) const {
     return Policy::decode(s, n, cp, consumed);
   }
@@ -276,7 +276,7 @@ struct PolicyEncoder {
   }
 };
 struct PointerDecoder {
-  static constexpr bool kAsciiRuns = false;
+  static constexpr bool kBulkToUtf32 = false;
   NLSUTFDecoder fn;
   uint32_t operator()(const uint8_t *s, int64_t n, uint32_t *cp, int64_t *consumed) const {
     return static_cast<uint32_t>(fn(s, n, cp, consumed));
@@ -290,9 +290,15 @@ struct PointerEncoder {
   }
 };
 
-// Widens the run of ASCII bytes at `s` (at most `max` of them) into 32-bit
-// units at `d`, in big- or little-endian order; returns the run's length.
-int64_t widen_ascii_runs(const uint8_t *s, uint8_t *d, int64_t max, bool big_endian);
+// The UTF-8 decoder and a 4-byte encoder in one pass: converts characters
+// from `s` + `consumed` into 32-bit slots at `d` + 4 x `chars` (big- or
+// little-endian) while at least 4 source bytes remain, fewer than `limit`
+// characters are stored and each lead byte is valid; advances `consumed` and
+// `chars`. It gives exactly what Utf8Decoder and Utf32Encoder give one by
+// one there (a fixed-width encoder cannot fail within the limit), and leaves
+// the last bytes and any invalid lead to them.
+void utf8_to_utf32_bulk(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, bool big_endian,
+                        int64_t &consumed, int64_t &chars);
 
 // Decodes `source` character by character and encodes each code point into a
 // 4-byte slot of `destination`: at most capacity / 4 characters. Stops at the
@@ -311,18 +317,12 @@ uint32_t convert_to_utf32(const uint8_t *source, int64_t source_bytes, uint8_t *
   int64_t room = capacity;
   uint32_t status = NLSSM_OK;
   while (chars < limit && consumed < source_bytes) {
-    if constexpr (Decoder::kAsciiRuns && Encoder::kFixedWidth4) {
-      // A fixed 4-byte encoder never fails within the limit, so a run of
-      // ASCII bytes converts the same way in bulk.
-      const int64_t run = std::min(limit - chars, source_bytes - consumed);
-      if (run >= 16 && source[consumed] < 0x80) {
-        const int64_t done =
-            widen_ascii_runs(source + consumed, destination + 4 * chars, run, Encoder::kBigEndian);
-        consumed += done;
-        chars += done;
-        room -= 4 * done;
-        if (chars == limit || consumed == source_bytes) break;
-      }
+    if constexpr (Decoder::kBulkToUtf32 && Encoder::kFixedWidth4) {
+      const int64_t before = chars;
+      utf8_to_utf32_bulk(source, source_bytes, destination, limit, Encoder::kBigEndian, consumed,
+                         chars);
+      room -= 4 * (chars - before);
+      if (chars == limit || consumed == source_bytes) break;
     }
     uint32_t c = 0;
     int64_t used = 0;

@@ -1,6 +1,6 @@
-// Vector paths of the UTF kit: the UTF-8 length of an array of 32-bit
-// characters (SSE2 and AVX2, chosen at run time) and the ASCII run widener
-// of the UTF-8 decoding driver.
+// Hot paths of the UTF kit: the UTF-8 length of an array of 32-bit
+// characters (SSE2 and AVX2, chosen at run time) and the bulk UTF-8 to
+// UTF-32 loop of the decoding driver (SSE2 for ASCII runs).
 #include <emmintrin.h>
 #include <immintrin.h>
 
@@ -109,39 +109,84 @@ int64_t utf8_length(const uint32_t *chars, int64_t count) {
   return fn(chars, count);
 }
 
-int64_t widen_ascii_runs(const uint8_t *s, uint8_t *d, int64_t max, bool big_endian) {
+namespace {
+
+// Widens 16 ASCII bytes into 16 32-bit slots: interleaving with zero bytes
+// on one side or the other puts each byte at the low or the high end of its
+// slot.
+template <Order O>
+inline void widen16(__m128i x, uint8_t *d) {
   const __m128i zero = _mm_setzero_si128();
-  int64_t i = 0;
-  for (; i + 16 <= max; i += 16) {
-    const __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i));
-    if (_mm_movemask_epi8(x) != 0) break;
-    // Interleaving with zero bytes on the right side puts each byte at the
-    // low or the high end of its 32-bit slot.
-    __m128i lo = big_endian ? _mm_unpacklo_epi8(zero, x) : _mm_unpacklo_epi8(x, zero);
-    __m128i hi = big_endian ? _mm_unpackhi_epi8(zero, x) : _mm_unpackhi_epi8(x, zero);
-    __m128i out[4];
-    if (big_endian) {
-      out[0] = _mm_unpacklo_epi16(zero, lo);
-      out[1] = _mm_unpackhi_epi16(zero, lo);
-      out[2] = _mm_unpacklo_epi16(zero, hi);
-      out[3] = _mm_unpackhi_epi16(zero, hi);
-    } else {
-      out[0] = _mm_unpacklo_epi16(lo, zero);
-      out[1] = _mm_unpackhi_epi16(lo, zero);
-      out[2] = _mm_unpacklo_epi16(hi, zero);
-      out[3] = _mm_unpackhi_epi16(hi, zero);
+  auto *out = reinterpret_cast<__m128i *>(d);
+  if constexpr (kIsBig<O>) {
+    const __m128i lo = _mm_unpacklo_epi8(zero, x), hi = _mm_unpackhi_epi8(zero, x);
+    _mm_storeu_si128(out, _mm_unpacklo_epi16(zero, lo));
+    _mm_storeu_si128(out + 1, _mm_unpackhi_epi16(zero, lo));
+    _mm_storeu_si128(out + 2, _mm_unpacklo_epi16(zero, hi));
+    _mm_storeu_si128(out + 3, _mm_unpackhi_epi16(zero, hi));
+  } else {
+    const __m128i lo = _mm_unpacklo_epi8(x, zero), hi = _mm_unpackhi_epi8(x, zero);
+    _mm_storeu_si128(out, _mm_unpacklo_epi16(lo, zero));
+    _mm_storeu_si128(out + 1, _mm_unpackhi_epi16(lo, zero));
+    _mm_storeu_si128(out + 2, _mm_unpacklo_epi16(hi, zero));
+    _mm_storeu_si128(out + 3, _mm_unpackhi_epi16(hi, zero));
+  }
+}
+
+template <Order O>
+void bulk_to_utf32(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, int64_t &consumed,
+                   int64_t &chars) {
+  int64_t i = consumed, k = chars;
+  while (k < limit && n - i >= 4) {
+    const uint32_t b = s[i];
+    if (b < 0x80) {
+      if (n - i >= 16 && limit - k >= 16) {
+        const __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i));
+        const int mask = _mm_movemask_epi8(x);
+        if (mask == 0) {
+          widen16<O>(x, d + 4 * k);
+          i += 16;
+          k += 16;
+          continue;
+        }
+        // The ASCII bytes before the block's first byte >= 0x80.
+        const int run = __builtin_ctz(static_cast<unsigned>(mask));
+        for (int j = 0; j < run; ++j) store32<O>(d + 4 * (k + j), s[i + j]);
+        i += run;
+        k += run;
+        continue;
+      }
+      store32<O>(d + 4 * k++, b);
+      ++i;
+      continue;
     }
-    for (int k = 0; k < 4; ++k)
-      _mm_storeu_si128(reinterpret_cast<__m128i *>(d + 4 * i + 16 * k), out[k]);
+    uint32_t c;
+    if (b >= 0xC2 && b <= 0xDF) {
+      c = (b & 0x1F) << 6 | (s[i + 1] & 0x3F);
+      i += 2;
+    } else if (b >= 0xE0 && b <= 0xEF) {
+      c = (b & 0x0F) << 12 | (s[i + 1] & 0x3F) << 6 | (s[i + 2] & 0x3F);
+      i += 3;
+    } else if (b >= 0xF0 && b <= 0xF4) {
+      c = (b & 0x07) << 18 | (s[i + 1] & 0x3F) << 12 | (s[i + 2] & 0x3F) << 6 | (s[i + 3] & 0x3F);
+      i += 4;
+    } else {
+      break;  // an invalid lead: the one-character decoder reports it
+    }
+    store32<O>(d + 4 * k++, c);
   }
-  for (; i < max && s[i] < 0x80; ++i) {
-    const uint8_t b = s[i];
-    uint8_t *slot = d + 4 * i;
-    slot[0] = big_endian ? 0 : b;
-    slot[1] = slot[2] = 0;
-    slot[3] = big_endian ? b : 0;
-  }
-  return i;
+  consumed = i;
+  chars = k;
+}
+
+}  // namespace
+
+void utf8_to_utf32_bulk(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, bool big_endian,
+                        int64_t &consumed, int64_t &chars) {
+  if (big_endian)
+    bulk_to_utf32<Order::big>(s, n, d, limit, consumed, chars);
+  else
+    bulk_to_utf32<Order::little>(s, n, d, limit, consumed, chars);
 }
 
 }  // namespace nlssm::unicode

@@ -1,0 +1,171 @@
+// UTF-8 -> UTF-32 with the module's driver and with ICU, on the same text,
+// and the UTF-8 length of a UTF-32 array on each instruction-set path.
+#include <benchmark/benchmark.h>
+#include <nlssm/nlssm.h>
+#include <unicode/ucnv.h>
+#include <unicode/ustring.h>
+#include <unicode/utf8.h>
+
+#include <random>
+#include <string>
+#include <vector>
+
+#include "unicode/codec.hpp"
+
+namespace {
+
+// Kinds of text: 0 ASCII, 1 European (about 1 in 12 characters non-ASCII),
+// 2 mixed scripts (Cyrillic, CJK, an emoji now and then, ASCII spaces).
+std::vector<uint32_t> make_text(int kind, size_t chars) {
+  std::mt19937 rng(12345);
+  std::vector<uint32_t> text;
+  text.reserve(chars);
+  while (text.size() < chars) {
+    const unsigned r = rng() % 100;
+    uint32_t c;
+    if (kind == 0 || (kind == 1 && r < 92) || (kind == 2 && r < 25))
+      c = r % 7 == 0 ? ' ' : 'a' + rng() % 26;
+    else if (kind == 1 || r < 50)
+      c = kind == 1 ? 0xC0 + rng() % 64 : 0x410 + rng() % 64;
+    else if (r < 97)
+      c = 0x4E00 + rng() % 0x5000;
+    else
+      c = 0x1F600 + rng() % 64;
+    text.push_back(c);
+  }
+  return text;
+}
+
+std::string to_utf8(const std::vector<uint32_t> &text) {
+  std::string out;
+  for (uint32_t c : text) {
+    char buf[4];
+    int32_t n = 0;
+    U8_APPEND_UNSAFE(buf, n, c);
+    out.append(buf, n);
+  }
+  return out;
+}
+
+constexpr size_t kChars = 1 << 16;
+
+struct Corpus {
+  std::vector<uint32_t> utf32;
+  std::string utf8;
+  explicit Corpus(int kind) : utf32(make_text(kind, kChars)), utf8(to_utf8(utf32)) {}
+};
+
+const Corpus &corpus(int kind) {
+  static const Corpus corpora[3] = {Corpus(0), Corpus(1), Corpus(2)};
+  return corpora[kind];
+}
+
+void label(benchmark::State &state, const Corpus &c) {
+  static const char *names[] = {"ascii", "european", "mixed"};
+  state.SetLabel(names[state.range(0)]);
+  state.SetBytesProcessed(state.iterations() * c.utf8.size());
+  state.counters["chars/s"] =
+      benchmark::Counter(double(state.iterations()) * c.utf32.size(), benchmark::Counter::kIsRate);
+}
+
+void BM_ConvertToUTF32(benchmark::State &state) {
+  const Corpus &c = corpus(state.range(0));
+  std::vector<uint32_t> out(c.utf32.size());
+  for (auto _ : state) {
+    int64_t written = 0;
+    ConvertToUTF32(c.utf8.data(), c.utf8.size(), out.data(), out.size() * 4, &written, UTF8_UTF32,
+                   COPY_UTF32_SWAP);
+    benchmark::DoNotOptimize(written);
+  }
+  if (out != c.utf32) state.SkipWithError("wrong result");
+  label(state, c);
+}
+
+// The same decoder behind a pointer the driver does not recognise.
+int64_t utf8_via_pointer(const uint8_t *s, int64_t n, uint32_t *cp, int64_t *consumed) {
+  return UTF8_UTF32(s, n, cp, consumed);
+}
+
+void BM_ConvertToUTF32_generic(benchmark::State &state) {
+  const Corpus &c = corpus(state.range(0));
+  std::vector<uint32_t> out(c.utf32.size());
+  for (auto _ : state) {
+    int64_t written = 0;
+    ConvertToUTF32(c.utf8.data(), c.utf8.size(), out.data(), out.size() * 4, &written,
+                   utf8_via_pointer, COPY_UTF32_SWAP);
+    benchmark::DoNotOptimize(written);
+  }
+  if (out != c.utf32) state.SkipWithError("wrong result");
+  label(state, c);
+}
+
+void BM_ICU_ucnv_convertEx(benchmark::State &state) {
+  const Corpus &c = corpus(state.range(0));
+  UErrorCode err = U_ZERO_ERROR;
+  UConverter *from = ucnv_open("UTF-8", &err);
+  UConverter *to = ucnv_open("UTF-32LE", &err);
+  std::vector<uint32_t> out(c.utf32.size());
+  std::vector<UChar> pivot(1024);
+  for (auto _ : state) {
+    char *target = reinterpret_cast<char *>(out.data());
+    const char *source = c.utf8.data();
+    UChar *pivot_source = pivot.data(), *pivot_target = pivot.data();
+    ucnv_convertEx(to, from, &target, target + out.size() * 4, &source, source + c.utf8.size(),
+                   pivot.data(), &pivot_source, &pivot_target, pivot.data() + pivot.size(), true,
+                   true, &err);
+    benchmark::DoNotOptimize(target);
+  }
+  if (U_FAILURE(err) || out != c.utf32) state.SkipWithError("ICU conversion failed");
+  ucnv_close(from);
+  ucnv_close(to);
+  label(state, c);
+}
+
+void BM_ICU_u_strFromUTF8_ToUTF32(benchmark::State &state) {
+  const Corpus &c = corpus(state.range(0));
+  UErrorCode err = U_ZERO_ERROR;
+  std::vector<UChar> utf16(c.utf32.size() * 2);
+  std::vector<uint32_t> out(c.utf32.size());
+  for (auto _ : state) {
+    int32_t units = 0, chars = 0;
+    u_strFromUTF8(utf16.data(), utf16.size(), &units, c.utf8.data(), c.utf8.size(), &err);
+    u_strToUTF32(reinterpret_cast<UChar32 *>(out.data()), out.size(), &chars, utf16.data(), units,
+                 &err);
+    benchmark::DoNotOptimize(chars);
+  }
+  if (U_FAILURE(err) || out != c.utf32) state.SkipWithError("ICU conversion failed");
+  label(state, c);
+}
+
+template <int64_t (*Fn)(const uint32_t *, int64_t)>
+void BM_Utf8Length(benchmark::State &state) {
+  const Corpus &c = corpus(state.range(0));
+  if (Fn == &nlssm::unicode::utf8_length_avx2 && !nlssm::unicode::avx2_usable()) {
+    state.SkipWithError("no AVX2");
+    return;
+  }
+  for (auto _ : state) benchmark::DoNotOptimize(Fn(c.utf32.data(), c.utf32.size()));
+  if (Fn(c.utf32.data(), c.utf32.size()) != int64_t(c.utf8.size()))
+    state.SkipWithError("wrong length");
+  label(state, c);
+}
+
+int64_t icu_u8_length(const uint32_t *chars, int64_t count) {
+  int64_t total = 0;
+  for (int64_t i = 0; i < count; ++i) total += U8_LENGTH(chars[i]);
+  return total;
+}
+
+}  // namespace
+
+BENCHMARK(BM_ConvertToUTF32)->DenseRange(0, 2);
+BENCHMARK(BM_ConvertToUTF32_generic)->DenseRange(0, 2);
+BENCHMARK(BM_ICU_ucnv_convertEx)->DenseRange(0, 2);
+BENCHMARK(BM_ICU_u_strFromUTF8_ToUTF32)->DenseRange(0, 2);
+BENCHMARK(BM_Utf8Length<GET_UTF8_LEN_FROM_QVCHAR>)->DenseRange(0, 2);
+BENCHMARK(BM_Utf8Length<nlssm::unicode::utf8_length_scalar>)->DenseRange(0, 2);
+BENCHMARK(BM_Utf8Length<nlssm::unicode::utf8_length_sse2>)->DenseRange(0, 2);
+BENCHMARK(BM_Utf8Length<nlssm::unicode::utf8_length_avx2>)->DenseRange(0, 2);
+BENCHMARK(BM_Utf8Length<icu_u8_length>)->DenseRange(0, 2);
+
+BENCHMARK_MAIN();
