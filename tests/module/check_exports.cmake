@@ -20,12 +20,14 @@ set(declared "")
 file(GLOB headers ${HEADERS}/*.h)
 foreach(header IN LISTS headers)
   file(READ ${header} text)
-  # Join continuation lines: a declaration may wrap before its parameter list.
+  # A declaration runs from the macro to its parameter list or, for data, to
+  # its semicolon (which CMake then reads as a list separator).
   string(REGEX MATCHALL "NLSSM_(DATA_)?API[^;(]*[(;]" decls "${text}")
   foreach(decl IN LISTS decls)
-    string(REGEX MATCH "([A-Za-z_][A-Za-z0-9_]*)[ \t\r\n]*(\\[[^]]*\\])?[ \t\r\n]*[(;]$" _ "${decl}")
-    if(NOT CMAKE_MATCH_1 MATCHES "^__")
-      list(APPEND declared ${CMAKE_MATCH_1})
+    string(REGEX MATCH "([A-Za-z_][A-Za-z0-9_]*)[ \t\r\n]*(\\[[^]]*\\])?[ \t\r\n]*[(;]?$" _ "${decl}")
+    set(name "${CMAKE_MATCH_1}")
+    if(NOT name MATCHES "^__")
+      list(APPEND declared ${name})
     endif()
   endforeach()
 endforeach()
