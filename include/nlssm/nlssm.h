@@ -512,7 +512,294 @@ NLSSM_API int64_t qvlStatusToBuf(void *hostObject, uint32_t status, void *a1, vo
 NLSSM_API int64_t qvlStatusToJnl(void *hostObject, uint32_t messageNumber, uint32_t status, ...);
 NLSSM_API int64_t qvlGetLocale(void *hostObject, ...);
 
+/* ---- Character stepping, positioning and counting ------------------------
+ * Cursor members (slots 19, 20, 26) move a descriptor's current character:
+ * stringNextChar answers the new charIndex or -9, stringSetPos the target
+ * index or -99 (pos may be NLSSM_POS_CURRENT or NLSSM_POS_LAST),
+ * stringCurCharSize the current character's bytes or -10. */
+NLSSM_API int64_t stringNextChar_SBCS(const NLSSMHandle *handle, NLSString *string);
+NLSSM_API int64_t stringNextChar_UTF8(const NLSSMHandle *handle, NLSString *string);
+NLSSM_API int64_t stringNextChar_WCS2(const NLSSMHandle *handle, NLSString *string);
+NLSSM_API int64_t stringNextChar_WCS4(const NLSSMHandle *handle, NLSString *string);
+NLSSM_API int64_t stringNextChar_MBCS_modal(const NLSSMHandle *handle, NLSString *string);
+NLSSM_API int64_t stringNextChar_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string);
+NLSSM_API int64_t stringNextChar_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, NLSString *string);
+NLSSM_API int64_t stringNextChar_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, NLSString *string);
+NLSSM_API int64_t stringNextChar_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                       NLSString *string);
+
+NLSSM_API int64_t stringSetPos_SBCS(const NLSSMHandle *handle, NLSString *string, int64_t pos,
+                                    int64_t delta);
+NLSSM_API int64_t stringSetPos_UTF8(const NLSSMHandle *handle, NLSString *string, int64_t pos,
+                                    int64_t delta);
+NLSSM_API int64_t stringSetPos_WCS2(const NLSSMHandle *handle, NLSString *string, int64_t pos,
+                                    int64_t delta);
+NLSSM_API int64_t stringSetPos_WCS4(const NLSSMHandle *handle, NLSString *string, int64_t pos,
+                                    int64_t delta);
+NLSSM_API int64_t stringSetPos_MBCS_modal(const NLSSMHandle *handle, NLSString *string, int64_t pos,
+                                          int64_t delta);
+NLSSM_API int64_t stringSetPos_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                             int64_t pos, int64_t delta);
+NLSSM_API int64_t stringSetPos_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, NLSString *string,
+                                                    int64_t pos, int64_t delta);
+NLSSM_API int64_t stringSetPos_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, NLSString *string,
+                                                    int64_t pos, int64_t delta);
+NLSSM_API int64_t stringSetPos_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, NLSString *string,
+                                                     int64_t pos, int64_t delta);
+
+NLSSM_API int64_t stringCurCharSize_FixedSize(const NLSSMHandle *handle, const NLSString *string);
+NLSSM_API int64_t stringCurCharSize_UTF8(const NLSSMHandle *handle, const NLSString *string);
+NLSSM_API int64_t stringCurCharSize_WCS2(const NLSSMHandle *handle, const NLSString *string);
+NLSSM_API int64_t stringCurCharSize_MBCS_modal(const NLSSMHandle *handle, const NLSString *string);
+NLSSM_API int64_t stringCurCharSize_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                  const NLSString *string);
+
+/* Size of one character, reading at most `remaining` bytes: at `base`, or
+ * at the descriptor's current offset when base is null. 0 when remaining is
+ * 0; a malformed character measures 1. The modal probe measures a shift
+ * sequence as its own length and a character by the descriptor's kind. */
+NLSSM_API int64_t getMBCSCharSZ_UCS2L(const NLSSMHandle *handle, const NLSString *string,
+                                      int64_t remaining, const uint8_t *base);
+NLSSM_API int64_t getMBCSCharSZ_UCS2B(const NLSSMHandle *handle, const NLSString *string,
+                                      int64_t remaining, const uint8_t *base);
+NLSSM_API int64_t getMBCSCharSZ_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                     int64_t remaining, const uint8_t *base);
+NLSSM_API int64_t getMBCSCharSZ_UTFE(const NLSSMHandle *handle, const NLSString *string,
+                                     int64_t remaining, const uint8_t *base);
+NLSSM_API int64_t getMBCSCharSZ_EUC_JP(const NLSSMHandle *handle, const NLSString *string,
+                                       int64_t remaining, const uint8_t *base);
+NLSSM_API int64_t getMBCSCharSZ_EUC_TW(const NLSSMHandle *handle, const NLSString *string,
+                                       int64_t remaining, const uint8_t *base);
+NLSSM_API int64_t getMBCSCharSZ_GB18030(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t remaining, const uint8_t *base);
+NLSSM_API int64_t getMBCSCharSZ_nonmodal(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t remaining, const uint8_t *base);
+NLSSM_API int64_t getMBCSCharSZ_modal(const NLSSMHandle *handle, const NLSString *string,
+                                      int64_t remaining, const uint8_t *base);
+
+/* Byte offset of character `nChars` (0-based) counted from `startOffset`,
+ * or -9 when the text ends first. `state` (may be null) gives the modal
+ * shift state at startOffset (0 = single-byte) and receives the kind of the
+ * character found (0 when none). */
+NLSSM_API int64_t getDBCSPos_modal(const NLSSMHandle *handle, const uint8_t *buffer, int64_t length,
+                                   int64_t nChars, int64_t startOffset, uint32_t *state);
+NLSSM_API int64_t getDBCSPos_nonmodal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                      int64_t length, int64_t nChars, int64_t startOffset,
+                                      uint32_t *state);
+NLSSM_API int64_t getDBCSPos_nonmodal_EUC_JP(const NLSSMHandle *handle, const uint8_t *buffer,
+                                             int64_t length, int64_t nChars, int64_t startOffset,
+                                             uint32_t *state);
+NLSSM_API int64_t getDBCSPos_nonmodal_EUC_TW(const NLSSMHandle *handle, const uint8_t *buffer,
+                                             int64_t length, int64_t nChars, int64_t startOffset,
+                                             uint32_t *state);
+NLSSM_API int64_t getDBCSPos_nonmodal_GB18030(const NLSSMHandle *handle, const uint8_t *buffer,
+                                              int64_t length, int64_t nChars, int64_t startOffset,
+                                              uint32_t *state);
+
+/* Character counts (slots 6, 48): status result, count through `count`
+ * (partial on 0x803fe82c). Flag bit 4: broken sequences are not counted. */
+NLSSM_API int64_t NLSNumChars_SBCS(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumCharsS_SBCS(const NLSSMHandle *handle, const uint8_t *buffer,
+                                    int64_t byteLength, int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumChars_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumCharsS_UTF8(const NLSSMHandle *handle, const uint8_t *buffer,
+                                    int64_t byteLength, int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumChars_UTFE(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumCharsS_UTFE(const NLSSMHandle *handle, const uint8_t *buffer,
+                                    int64_t byteLength, int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumChars_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumCharsS_WCS2(const NLSSMHandle *handle, const uint8_t *buffer,
+                                    int64_t byteLength, int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumChars_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumCharsS_WCS4(const NLSSMHandle *handle, const uint8_t *buffer,
+                                    int64_t byteLength, int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumChars_MBCS_modal(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumCharsS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                          int64_t byteLength, int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumChars_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *string,
+                                            int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumCharsS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                             int64_t byteLength, int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumChars_MBCS_EUC_JP(const NLSSMHandle *handle, const NLSString *string,
+                                          int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumCharsS_MBCS_EUC_JP(const NLSSMHandle *handle, const uint8_t *buffer,
+                                           int64_t byteLength, int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumChars_MBCS_EUC_TW(const NLSSMHandle *handle, const NLSString *string,
+                                          int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumCharsS_MBCS_EUC_TW(const NLSSMHandle *handle, const uint8_t *buffer,
+                                           int64_t byteLength, int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumChars_MBCS_GB18030(const NLSSMHandle *handle, const NLSString *string,
+                                           int64_t flags, int64_t *count);
+NLSSM_API int64_t NLSNumCharsS_MBCS_GB18030(const NLSSMHandle *handle, const uint8_t *buffer,
+                                            int64_t byteLength, int64_t flags, int64_t *count);
+
+/* Lengths of zero-terminated text (slots 72, 101), in characters and bytes
+ * (either output may be null); the byte lengths of characters (slots 102,
+ * 40, 114). NLSStringBLength: bytes of the first charCount characters (the
+ * text must hold them), or with a negative count of the whole text up to
+ * its terminating zero unit. */
+NLSSM_API int64_t NLSStringLength_SBCS(const NLSSMHandle *handle, const uint8_t *text,
+                                       int64_t *charCount, int64_t *byteCount, int64_t flags);
+NLSSM_API int64_t NLSStringByteLength_SBCS(const NLSSMHandle *handle, const NLSString *string,
+                                           int64_t charLimit);
+NLSSM_API int64_t NLSStringLength_UTF8(const NLSSMHandle *handle, const uint8_t *text,
+                                       int64_t *charCount, int64_t *byteCount, int64_t flags);
+NLSSM_API int64_t NLSStringByteLength_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                           int64_t charLimit);
+NLSSM_API int64_t NLSStringLength_UTFE(const NLSSMHandle *handle, const uint8_t *text,
+                                       int64_t *charCount, int64_t *byteCount, int64_t flags);
+NLSSM_API int64_t NLSStringByteLength_UTFE(const NLSSMHandle *handle, const NLSString *string,
+                                           int64_t charLimit);
+NLSSM_API int64_t NLSStringLength_WCS2(const NLSSMHandle *handle, const uint8_t *text,
+                                       int64_t *charCount, int64_t *byteCount, int64_t flags);
+NLSSM_API int64_t NLSStringByteLength_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                           int64_t charLimit);
+NLSSM_API int64_t NLSStringLength_WCS4(const NLSSMHandle *handle, const uint8_t *text,
+                                       int64_t *charCount, int64_t *byteCount, int64_t flags);
+NLSSM_API int64_t NLSStringByteLength_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                           int64_t charLimit);
+NLSSM_API int64_t NLSStringLength_MBCS_modal(const NLSSMHandle *handle, const uint8_t *text,
+                                             int64_t *charCount, int64_t *byteCount, int64_t flags);
+NLSSM_API int64_t NLSStringByteLength_MBCS_modal(const NLSSMHandle *handle, const NLSString *string,
+                                                 int64_t charLimit);
+NLSSM_API int64_t NLSStringLength_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *text,
+                                                int64_t *charCount, int64_t *byteCount,
+                                                int64_t flags);
+NLSSM_API int64_t NLSStringByteLength_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                    const NLSString *string, int64_t charLimit);
+NLSSM_API int64_t NLSStringLength_MBCS_EUC_JP(const NLSSMHandle *handle, const uint8_t *text,
+                                              int64_t *charCount, int64_t *byteCount,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringByteLength_MBCS_EUC_JP(const NLSSMHandle *handle,
+                                                  const NLSString *string, int64_t charLimit);
+NLSSM_API int64_t NLSStringLength_MBCS_EUC_TW(const NLSSMHandle *handle, const uint8_t *text,
+                                              int64_t *charCount, int64_t *byteCount,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringByteLength_MBCS_EUC_TW(const NLSSMHandle *handle,
+                                                  const NLSString *string, int64_t charLimit);
+NLSSM_API int64_t NLSStringLength_MBCS_GB18030(const NLSSMHandle *handle, const uint8_t *text,
+                                               int64_t *charCount, int64_t *byteCount,
+                                               int64_t flags);
+NLSSM_API int64_t NLSStringByteLength_MBCS_GB18030(const NLSSMHandle *handle,
+                                                   const NLSString *string, int64_t charLimit);
+NLSSM_API int64_t NLSStringNLength_SBCS(const NLSSMHandle *handle, const uint8_t *text,
+                                        int64_t byteLimit, int64_t *charCount, int64_t *byteCount);
+NLSSM_API int64_t NLSStringBLength_SBCS(const NLSSMHandle *handle, const uint8_t *text,
+                                        int64_t charCount);
+NLSSM_API int64_t NLSStringByteLengthC_SBCS(const NLSSMHandle *handle, const uint8_t *buffer,
+                                            int64_t byteLength, int64_t flags);
+NLSSM_API int64_t NLSStringNLength_UTF8(const NLSSMHandle *handle, const uint8_t *text,
+                                        int64_t byteLimit, int64_t *charCount, int64_t *byteCount);
+NLSSM_API int64_t NLSStringBLength_UTF8(const NLSSMHandle *handle, const uint8_t *text,
+                                        int64_t charCount);
+NLSSM_API int64_t NLSStringByteLengthC_UTF8(const NLSSMHandle *handle, const uint8_t *buffer,
+                                            int64_t byteLength, int64_t flags);
+NLSSM_API int64_t NLSStringNLength_WCS2(const NLSSMHandle *handle, const uint8_t *text,
+                                        int64_t byteLimit, int64_t *charCount, int64_t *byteCount);
+NLSSM_API int64_t NLSStringBLength_WCS2(const NLSSMHandle *handle, const uint8_t *text,
+                                        int64_t charCount);
+NLSSM_API int64_t NLSStringByteLengthC_WCS2(const NLSSMHandle *handle, const uint8_t *buffer,
+                                            int64_t byteLength, int64_t flags);
+NLSSM_API int64_t NLSStringNLength_WCS4(const NLSSMHandle *handle, const uint8_t *text,
+                                        int64_t byteLimit, int64_t *charCount, int64_t *byteCount);
+NLSSM_API int64_t NLSStringBLength_WCS4(const NLSSMHandle *handle, const uint8_t *text,
+                                        int64_t charCount);
+NLSSM_API int64_t NLSStringByteLengthC_WCS4(const NLSSMHandle *handle, const uint8_t *buffer,
+                                            int64_t byteLength, int64_t flags);
+NLSSM_API int64_t NLSStringNLength_MBCS_modal(const NLSSMHandle *handle, const uint8_t *text,
+                                              int64_t byteLimit, int64_t *charCount,
+                                              int64_t *byteCount);
+NLSSM_API int64_t NLSStringBLength_MBCS_modal(const NLSSMHandle *handle, const uint8_t *text,
+                                              int64_t charCount);
+NLSSM_API int64_t NLSStringByteLengthC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                                  int64_t byteLength, int64_t flags);
+NLSSM_API int64_t NLSStringNLength_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *text,
+                                                 int64_t byteLimit, int64_t *charCount,
+                                                 int64_t *byteCount);
+NLSSM_API int64_t NLSStringBLength_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *text,
+                                                 int64_t charCount);
+NLSSM_API int64_t NLSStringByteLengthC_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                     const uint8_t *buffer, int64_t byteLength,
+                                                     int64_t flags);
+NLSSM_API int64_t NLSStringNLength_MBCS_EUC_JP(const NLSSMHandle *handle, const uint8_t *text,
+                                               int64_t byteLimit, int64_t *charCount,
+                                               int64_t *byteCount);
+NLSSM_API int64_t NLSStringBLength_MBCS_EUC_JP(const NLSSMHandle *handle, const uint8_t *text,
+                                               int64_t charCount);
+NLSSM_API int64_t NLSStringByteLengthC_MBCS_EUC_JP(const NLSSMHandle *handle, const uint8_t *buffer,
+                                                   int64_t byteLength, int64_t flags);
+NLSSM_API int64_t NLSStringNLength_MBCS_EUC_TW(const NLSSMHandle *handle, const uint8_t *text,
+                                               int64_t byteLimit, int64_t *charCount,
+                                               int64_t *byteCount);
+NLSSM_API int64_t NLSStringBLength_MBCS_EUC_TW(const NLSSMHandle *handle, const uint8_t *text,
+                                               int64_t charCount);
+NLSSM_API int64_t NLSStringByteLengthC_MBCS_EUC_TW(const NLSSMHandle *handle, const uint8_t *buffer,
+                                                   int64_t byteLength, int64_t flags);
+NLSSM_API int64_t NLSStringNLength_MBCS_GB18030(const NLSSMHandle *handle, const uint8_t *text,
+                                                int64_t byteLimit, int64_t *charCount,
+                                                int64_t *byteCount);
+NLSSM_API int64_t NLSStringBLength_MBCS_GB18030(const NLSSMHandle *handle, const uint8_t *text,
+                                                int64_t charCount);
+NLSSM_API int64_t NLSStringByteLengthC_MBCS_GB18030(const NLSSMHandle *handle,
+                                                    const uint8_t *buffer, int64_t byteLength,
+                                                    int64_t flags);
+
+/* Bytes of the first `chars` characters of a raw buffer, never past
+ * byteLength. */
+NLSSM_API int64_t getDBCSStringLen_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                                 int64_t byteLength, int64_t chars);
+NLSSM_API int64_t getDBCSStringLen_MBCS_EUC_JP(const NLSSMHandle *handle, const uint8_t *buffer,
+                                               int64_t byteLength, int64_t chars);
+NLSSM_API int64_t getDBCSStringLen_MBCS_EUC_TW(const NLSSMHandle *handle, const uint8_t *buffer,
+                                               int64_t byteLength, int64_t chars);
+NLSSM_API int64_t getDBCSStringLen_MBCS_GB18030(const NLSSMHandle *handle, const uint8_t *buffer,
+                                                int64_t byteLength, int64_t chars);
+
+/* Blank padding (slots 7, 49) and all-blank tests (slots 8, 50). */
+NLSSM_API int64_t NLSBlankPad(const NLSSMHandle *handle, int64_t byteCount, NLSString *string,
+                              int64_t ignored, int64_t *written);
+NLSSM_API int64_t NLSBlankPad_SBCS(const NLSSMHandle *handle, int64_t byteCount, NLSString *string,
+                                   int64_t ignored, int64_t *written);
+NLSSM_API int64_t NLSBlankPad_WCS(const NLSSMHandle *handle, int64_t byteCount, NLSString *string,
+                                  int64_t ignored, int64_t *written);
+NLSSM_API int64_t NLSBlankPad_MBCS_modal(const NLSSMHandle *handle, int64_t byteCount,
+                                         NLSString *string, int64_t ignored, int64_t *written);
+NLSSM_API int64_t NLSBlankPadS(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteCount,
+                               int64_t ignored, int64_t *written);
+NLSSM_API int64_t NLSBlankPadS_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteCount,
+                                    int64_t ignored, int64_t *written);
+NLSSM_API int64_t NLSBlankPadS_WCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteCount,
+                                   int64_t ignored, int64_t *written);
+NLSSM_API int64_t NLSAllBlanks(const NLSSMHandle *handle, const NLSString *string);
+NLSSM_API int64_t NLSAllBlanks_SBCS(const NLSSMHandle *handle, const NLSString *string);
+NLSSM_API int64_t NLSAllBlanks_WCS(const NLSSMHandle *handle, const NLSString *string);
+NLSSM_API int64_t NLSAllBlanks_MBCS_modal(const NLSSMHandle *handle, const NLSString *string);
+NLSSM_API int64_t NLSAllBlanksS(const NLSSMHandle *handle, const uint8_t *buffer,
+                                int64_t byteLength);
+NLSSM_API int64_t NLSAllBlanksS_SBCS(const NLSSMHandle *handle, const uint8_t *buffer,
+                                     int64_t byteLength);
+NLSSM_API int64_t NLSAllBlanksS_WCS(const NLSSMHandle *handle, const uint8_t *buffer,
+                                    int64_t byteLength);
+NLSSM_API int64_t NLSAllBlanksS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                           int64_t byteLength);
+
+/* UTF-8 toolkit lengths: the sequence length announced by each first byte
+ * (continuation bytes 1), and the bytes of the first charCount characters
+ * (negative: up to the terminating zero byte). */
+NLSSM_DATA_API const uint8_t u8Length[256];
+NLSSM_API int64_t qvzsu8ByteLength(const uint8_t *text, int64_t charCount);
+
 /* ---- Catalogue tables ------------------------------------------------------ */
+/* The bidirectional table of a single-byte right-to-left encoding (2064 bytes:
+ * 256 u32 categories, the page's ( ) [ ] { } < > and their mirrors, 256 u32
+ * categories for reordering), or null for any other encoding number. */
+NLSSM_API const uint8_t *NLSGetBIDICategorySBCSTab(int32_t encodingNumber);
 
 /* ---- UTF conversions -------------------------------------------------------
  * One-character codecs between UTF-8, UTF-16 and UTF-32, two buffer drivers,
