@@ -96,8 +96,12 @@ enum class Beyond {
 
 using CountFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, int64_t, int64_t *);
 
+// The character count of the whole text, through the handle's NLSNumCharsS
+// slot (so UTF-EBCDIC handles count by their own rule), or `fn` when the
+// slot is empty.
 inline int64_t count_with(CountFn fn, const NLSSMHandle *h, const NLSString &s) {
   int64_t count = 0;
+  if (h->NLSNumCharsS != nullptr) fn = reinterpret_cast<CountFn>(h->NLSNumCharsS);
   fn(h, s.buffer, static_cast<int64_t>(s.length), 0, &count);
   return count;
 }
