@@ -1,6 +1,7 @@
 // Locale objects: number parsing and formatting with ICU's number formats for
 // the locale, over bytes (UTF-8, ASCII-based, EBCDIC-based) and 32-bit
 // characters.
+#include <unicode/uloc.h>
 #include <unicode/unum.h>
 #include <unicode/utf16.h>
 #include <unicode/utf8.h>
@@ -89,12 +90,18 @@ std::int64_t parse_units(LocaleObject *locale, Units &units, std::int32_t source
   }
   std::lock_guard lock(locale->mutex);
   unum_setAttribute(locale->decimal, UNUM_GROUPING_USED, 1);
-  auto position = static_cast<int32_t>(at);
+  // ICU's parser takes a minus sign but no plus sign: step over a plus here.
+  std::size_t start = at;
+  const std::u16string &plus = locale->plusSign;
+  if (!plus.empty() && units.text.compare(at, plus.size(), plus) == 0) start += plus.size();
+  auto position = static_cast<int32_t>(start);
   UErrorCode error = U_ZERO_ERROR;
   const double parsed =
-      unum_parseDouble(locale->decimal, reinterpret_cast<const UChar *>(units.text.data()),
-                       static_cast<int32_t>(length), &position, &error);
-  if (U_FAILURE(error) || static_cast<std::size_t>(position) == at) {
+      start < length && (start == at || units.text[start] != u'-')
+          ? unum_parseDouble(locale->decimal, reinterpret_cast<const UChar *>(units.text.data()),
+                             static_cast<int32_t>(length), &position, &error)
+          : (error = U_PARSE_ERROR, 0.0);
+  if (U_FAILURE(error) || static_cast<std::size_t>(position) == start) {
     *consumed = units.offsets[at];
     return NLSHOST_E_NOT_A_NUMBER;
   }
@@ -273,6 +280,11 @@ std::int64_t format_field(LocaleObject *locale, const Number &number, std::int64
     unum_setAttribute(format, UNUM_MIN_FRACTION_DIGITS, static_cast<int32_t>(decimals));
     unum_setAttribute(format, UNUM_MAX_FRACTION_DIGITS, static_cast<int32_t>(decimals));
     unum_setAttribute(format, UNUM_ROUNDING_MODE, UNUM_ROUND_HALFUP);
+    if (format == locale->scientific) {
+      // One digit before the decimal separator: d.dddE±n.
+      unum_setAttribute(format, UNUM_MIN_INTEGER_DIGITS, 1);
+      unum_setAttribute(format, UNUM_MAX_INTEGER_DIGITS, 1);
+    }
     UChar buffer[128];
     UErrorCode error = U_ZERO_ERROR;
     const int32_t n = number.integer
@@ -373,11 +385,18 @@ void locale_destroy(void *object) {
 }  // namespace
 
 void *new_locale_object(const std::string &name, ObjectCounters &counters) {
-  auto locale = std::make_unique<LocaleObject>();
+  // Only known languages and regions: ICU would quietly fall back to its
+  // default locale for anything else.
+  if (*uloc_getISO3Language(name.c_str()) == '\0') return nullptr;
+  char country[16];
   UErrorCode error = U_ZERO_ERROR;
+  if (uloc_getCountry(name.c_str(), country, sizeof country, &error) > 0 &&
+      *uloc_getISO3Country(name.c_str()) == '\0')
+    return nullptr;
+  auto locale = std::make_unique<LocaleObject>();
+  error = U_ZERO_ERROR;
   locale->decimal = unum_open(UNUM_DECIMAL, nullptr, 0, name.c_str(), nullptr, &error);
-  // A locale ICU has no data for falls back to the default: refuse it.
-  if (U_FAILURE(error) || error == U_USING_DEFAULT_WARNING) return nullptr;
+  if (U_FAILURE(error)) return nullptr;
   error = U_ZERO_ERROR;
   locale->scientific = unum_open(UNUM_SCIENTIFIC, nullptr, 0, name.c_str(), nullptr, &error);
   if (U_FAILURE(error)) return nullptr;

@@ -41,12 +41,14 @@ ReferenceHost::ReferenceHost() : parts_(std::make_unique<Parts>()) {
   parts_->nls = new_nls_object(pools_, parts_->counters);
 }
 
-std::unique_ptr<ReferenceHost> ReferenceHost::start(const ModuleEntry &entry) {
+std::unique_ptr<ReferenceHost> ReferenceHost::start(const ModuleEntry &entry,
+                                                    void (*prepare)(ReferenceHost &)) {
   if (entry.extent == nullptr || entry.construct == nullptr) return nullptr;
   std::unique_ptr<ReferenceHost> host(new ReferenceHost);
+  if (prepare != nullptr) prepare(*host);
   entry.extent(host->service());
   host->module_ = entry.construct(host->service(), host->journal_object());
-  if (host->module_ == nullptr) return nullptr;
+  if (host->module_ == nullptr) return host;
   set_nls_module(
       host->nls(), host->module_,
       reinterpret_cast<EntryCallback>(NLSSM_HOST_SLOT(host->module_, kModuleWordDestroyCallback)));

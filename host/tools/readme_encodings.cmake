@@ -72,7 +72,7 @@ Embedding the module with it:
 
 auto host = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
 NLSSMHandle *latin1 = nullptr;
-if (host->create_handle(29, &latin1) == 0) {
+if (host->module() != nullptr && host->create_handle(29, &latin1) == 0) {
   // call operations through latin1's slots
 }
 host.reset();  // drops every handle, then destroys the module object

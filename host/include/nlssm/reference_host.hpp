@@ -146,10 +146,14 @@ class ReferenceHost {
  public:
   // Builds the service object, journal and NLS object, hands the service
   // object to the module (qvextent), creates the module object (qvnlssm)
-  // and wires the NLS object to it. Null when the module object cannot be
-  // created. One started host per module at a time (the module keeps the
-  // service object in one global).
-  static std::unique_ptr<ReferenceHost> start(const ModuleEntry &module);
+  // and wires the NLS object to it. When the module object cannot be created
+  // the host is returned without one: module() is null and the journal tells
+  // why. One started host per module at a time (the module keeps the service
+  // object in one global).
+  // `prepare`, when given, runs on the host before the module object is
+  // created (to set fault injection, for example).
+  static std::unique_ptr<ReferenceHost> start(const ModuleEntry &module,
+                                              void (*prepare)(ReferenceHost &) = nullptr);
   // A host without a module: its NLS object passes table entries to
   // `destroyCallback` when it is destroyed (may be null).
   static std::unique_ptr<ReferenceHost> standalone(std::int64_t (*destroyCallback)(void *entry));

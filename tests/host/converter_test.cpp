@@ -1,0 +1,174 @@
+// Converters: every described encoding round-trips a sample of its repertoire
+// through the host's character form, multi-byte characters respect the
+// record's byte ranges, and the statuses of short or bad input.
+#include <gtest/gtest.h>
+#include <unicode/ucnv.h>
+#include <unicode/uset.h>
+
+#include "host_test_support.hpp"
+
+using namespace hosttest;
+
+namespace {
+
+// Up to `limit` code points spread over the converter's round-trip set.
+std::u32string repertoire_sample(const char *converter, std::size_t limit) {
+  std::u32string all;
+  if (std::string(converter) == "builtin:utf-ebcdic") {
+    for (char32_t c = 0; c <= 0x10FFFF; c += 97)
+      if (c < 0xD800 || c > 0xDFFF) all.push_back(c);
+  } else {
+    UErrorCode error = U_ZERO_ERROR;
+    UConverter *cnv = ucnv_open(converter, &error);
+    USet *set = uset_openEmpty();
+    ucnv_getUnicodeSet(cnv, set, UCNV_ROUNDTRIP_SET, &error);
+    for (int32_t r = 0; r < uset_getItemCount(set); ++r) {
+      UChar32 start, end;
+      if (uset_getItem(set, r, &start, &end, nullptr, 0, &error) == 0)
+        for (UChar32 c = start; c <= end; ++c) all.push_back(static_cast<char32_t>(c));
+    }
+    uset_close(set);
+    ucnv_close(cnv);
+  }
+  const std::size_t step = all.size() / limit + 1;
+  std::u32string sample;
+  for (std::size_t i = 0; i < all.size(); i += step) sample.push_back(all[i]);
+  return sample;
+}
+
+bool in_ranges(const std::uint8_t *ranges, std::uint8_t byte) {
+  for (; ranges[0] != 0; ranges += 2)
+    if (byte >= ranges[0] && byte <= ranges[1]) return true;
+  return false;
+}
+
+struct Converter {
+  void *object;
+  ~Converter() {
+    if (object != nullptr) call<NLSHostConverterDestroyFn>(object, NLSHOST_SLOT_CONVERTER_DESTROY);
+  }
+  std::int64_t convert(const std::string &in, std::string &out, std::size_t capacity = 0) {
+    out.assign(capacity ? capacity : in.size() * 4 + 16, '\0');
+    std::uint64_t produced = 0;
+    const auto status = call<NLSHostConverterConvertFn>(
+        object, NLSHOST_SLOT_CONVERTER_CONVERT, static_cast<const void *>(in.data()),
+        static_cast<std::uint64_t>(in.size()), static_cast<void *>(out.data()),
+        static_cast<std::uint64_t>(out.size()), &produced, static_cast<void *>(nullptr));
+    out.resize(produced);
+    return status;
+  }
+};
+
+Converter between(void *nls, std::int64_t from, std::int64_t to) {
+  return {call<NLSHostConverterBetweenFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_BETWEEN, from, to,
+                                          static_cast<void *>(nullptr),
+                                          static_cast<void *>(nullptr))};
+}
+
+}  // namespace
+
+TEST(Converters, EveryDescribedEncodingRoundTripsItsRepertoire) {
+  auto host = standalone();
+  void *nls = host->nls();
+  for (const auto &row : nlssm::refhost::Registry::instance().rows()) {
+    if (!row.described) continue;
+    SCOPED_TRACE(row.number);
+    const std::u32string sample = repertoire_sample(row.converter.c_str(), 1500);
+    ASSERT_GT(sample.size(), 100u);
+    Converter to{call<NLSHostConverterForFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_TO,
+                                             std::int64_t{row.number}, static_cast<void *>(nullptr),
+                                             static_cast<void *>(nullptr))};
+    Converter from{
+        call<NLSHostConverterForFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_FROM, std::int64_t{row.number},
+                                    static_cast<void *>(nullptr), static_cast<void *>(nullptr))};
+    ASSERT_NE(to.object, nullptr);
+    ASSERT_NE(from.object, nullptr);
+    std::string encoded, decoded;
+    ASSERT_EQ(to.convert(host_chars(sample), encoded), 0);
+    ASSERT_EQ(from.convert(encoded, decoded), 0);
+    EXPECT_EQ(decoded, host_chars(sample));
+
+    // Each multi-byte character starts with a lead byte and goes on with a
+    // trail byte of the record's lists (modal sets: between shifts).
+    const NLSHostEncodingRecord &r = row.record;
+    if (r.encodingClass != 4 && r.encodingClass != 5) continue;
+    for (char32_t c : sample) {
+      std::string one;
+      ASSERT_EQ(to.convert(host_chars(std::u32string(1, c)), one), 0);
+      const auto *b = reinterpret_cast<const std::uint8_t *>(one.data());
+      if (r.encodingClass == 5 && one.size() >= 2) {
+        EXPECT_TRUE(in_ranges(r.charRanges.leadRanges, b[0]))
+            << std::hex << static_cast<std::uint32_t>(c);
+        EXPECT_TRUE(in_ranges(r.charRanges.trailRanges, b[1]))
+            << std::hex << static_cast<std::uint32_t>(c);
+      } else if (r.encodingClass == 4 && one.size() == 4) {
+        EXPECT_EQ(b[0], r.charRanges.shiftOut[0]);
+        EXPECT_EQ(b[3], r.charRanges.shiftIn[0]);
+        EXPECT_TRUE(in_ranges(r.charRanges.leadRanges, b[1]))
+            << std::hex << static_cast<std::uint32_t>(c);
+        EXPECT_TRUE(in_ranges(r.charRanges.trailRanges, b[2]))
+            << std::hex << static_cast<std::uint32_t>(c);
+      }
+    }
+  }
+  EXPECT_EQ(host->object_counts().converters, 0);
+}
+
+TEST(Converters, BetweenTwoEncodingsAndStatuses) {
+  auto host = standalone();
+  void *nls = host->nls();
+  std::string out;
+  // Windows-1252 to EBCDIC 037.
+  EXPECT_EQ(between(nls, 62, 78).convert("Az\xE9", out), 0);
+  EXPECT_EQ(out, "\xC1\xA9\x51");
+  // Into a modal set: shift-out before the double-byte character, shift-in after.
+  EXPECT_EQ(between(nls, 20, 117).convert("A\xE4\xB8\x80", out), 0);
+  ASSERT_EQ(out.size(), 5u);
+  EXPECT_EQ(out.substr(0, 2), "\xC1\x0E");
+  EXPECT_EQ(out.back(), '\x0F');
+  // A character the destination lacks becomes its substitution character.
+  EXPECT_EQ(between(nls, 20, 62).convert("\xE4\xB8\x80", out), 0);
+  EXPECT_EQ(out, "\x1A");
+  // A short destination gets whole characters only.
+  EXPECT_EQ(between(nls, 62, 20).convert("a\xE9", out, 2), NLSHOST_E_TOO_SMALL);
+  EXPECT_EQ(out, "a");
+  EXPECT_EQ(between(nls, 20, 62).convert("a\xFF", out), NLSHOST_E_ILL_FORMED);
+  EXPECT_EQ(out, "a");
+  EXPECT_EQ(between(nls, 20, 62).convert("a\xC3", out), NLSHOST_E_TRUNCATED);
+  EXPECT_EQ(between(nls, 161, 20).convert("\xC1\x80\x41", out), 0);
+  EXPECT_EQ(out, "A\xC2\xA0");
+  // Unknown numbers get no converter.
+  EXPECT_EQ(between(nls, 62, 0).object, nullptr);
+  EXPECT_EQ(between(nls, 265, 62).object, nullptr);
+}
+
+TEST(Converters, ConversionNeededAndSize) {
+  auto host = standalone();
+  void *nls = host->nls();
+  auto needed = [&](std::int64_t a, std::int64_t b) {
+    return call<NLSHostConversionNeededFn>(nls, NLSHOST_SLOT_NLS_CONVERSION_NEEDED, a, b,
+                                           static_cast<void *>(nullptr));
+  };
+  EXPECT_FALSE(needed(62, 62));
+  EXPECT_FALSE(needed(19, 25));
+  EXPECT_FALSE(needed(135, 136));  // the same converter under two names
+  EXPECT_TRUE(needed(62, 29));
+  EXPECT_TRUE(needed(62, 0));
+
+  std::uint64_t size = 0;
+  const char text[] = "a\xE9\x80";  // a, e-acute and the euro sign in windows-1252
+  EXPECT_EQ(call<NLSHostConversionSizeFn>(nls, NLSHOST_SLOT_NLS_CONVERSION_SIZE, std::int64_t{62},
+                                          std::int64_t{20}, static_cast<const void *>(text),
+                                          std::uint64_t{3}, &size),
+            0);
+  EXPECT_EQ(size, 6u);
+  EXPECT_EQ(call<NLSHostConversionSizeFn>(nls, NLSHOST_SLOT_NLS_CONVERSION_SIZE, std::int64_t{62},
+                                          std::int64_t{27}, static_cast<const void *>(text),
+                                          std::uint64_t{3}, &size),
+            0);
+  EXPECT_EQ(size, 12u);
+  EXPECT_EQ(call<NLSHostConversionSizeFn>(nls, NLSHOST_SLOT_NLS_CONVERSION_SIZE, std::int64_t{62},
+                                          std::int64_t{0}, static_cast<const void *>(text),
+                                          std::uint64_t{3}, &size),
+            NLSHOST_E_NO_ENCODING);
+}
