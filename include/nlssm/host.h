@@ -86,7 +86,9 @@ typedef int64_t (*NLSHostConverterConvertFn)(void *converter, const void *source
  * NLSHOST_E_TOO_SMALL after the whole characters that fit.
  * Slots the module calls: */
 #define NLSHOST_SLOT_NLS_CONVERSION_NEEDED 11 /* (nls, encA, encB, 0) -> bool */
-#define NLSHOST_SLOT_NLS_DESCRIBE 13          /* (nls, encoding, &record) -> status */
+/* (nls, encoding, &record) -> status; the record lives as long as the host.
+ * An unknown number, or one without a converter, gives NLSHOST_E_NO_ENCODING. */
+#define NLSHOST_SLOT_NLS_DESCRIBE 13
 #define NLSHOST_SLOT_NLS_CONVERTER_BETWEEN 14 /* (nls, from, to, 0, 0) -> converter */
 #define NLSHOST_SLOT_NLS_CONVERTER_FROM 15    /* (nls, encoding, 0, 0): encoding -> host chars */
 #define NLSHOST_SLOT_NLS_CONVERTER_TO 16      /* (nls, encoding, 0, 0): host chars -> encoding */
