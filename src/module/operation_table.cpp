@@ -56,9 +56,20 @@ Row every_class(int slot, NLSSlot f) {
   return {slot, {same(f), same(f), same(f), same(f), same(f), same(f)}};
 }
 
-// Slots 21 and 118 come last: they serve every class.
 const std::array kRows = {
     // slot, SBCS, UTF-8 / UTF-EBCDIC, WCS2, WCS4, MBCS modal, MBCS non-modal
+    Row{6,  // NLSNumChars
+        {same(op(&NLSNumChars_SBCS)), utf(op(&NLSNumChars_UTF8), op(&NLSNumChars_UTFE)),
+         same(op(&NLSNumChars_WCS2)), same(op(&NLSNumChars_WCS4)),
+         same(op(&NLSNumChars_MBCS_modal)),
+         dbcs(op(&NLSNumChars_MBCS_nonmodal), op(&NLSNumChars_MBCS_EUC_JP),
+              op(&NLSNumChars_MBCS_EUC_TW), op(&NLSNumChars_MBCS_GB18030))}},
+    Row{7,  // NLSBlankPad
+        {same(op(&NLSBlankPad_SBCS)), same(op(&NLSBlankPad)), same(op(&NLSBlankPad_WCS)),
+         same(op(&NLSBlankPad_WCS)), same(op(&NLSBlankPad_MBCS_modal)), same(op(&NLSBlankPad))}},
+    Row{8,  // NLSAllBlanks
+        {same(op(&NLSAllBlanks_SBCS)), same(op(&NLSAllBlanks)), same(op(&NLSAllBlanks_WCS)),
+         same(op(&NLSAllBlanks_WCS)), same(op(&NLSAllBlanks_MBCS_modal)), same(op(&NLSAllBlanks))}},
     every_class(14, op(&NLSStringInit)),
     Row{15,
         {same(op(&NLSCharInit_SBCS)), same(op(&NLSCharInit)), same(op(&NLSCharInit)),
@@ -66,7 +77,67 @@ const std::array kRows = {
     every_class(16, op(&NLSStringClean)),
     every_class(17, op(&stringDupPos)),
     every_class(18, op(&stringGetPos)),
+    Row{19,  // stringSetPos
+        {same(op(&stringSetPos_SBCS)), same(op(&stringSetPos_UTF8)), same(op(&stringSetPos_WCS2)),
+         same(op(&stringSetPos_WCS4)), same(op(&stringSetPos_MBCS_modal)),
+         dbcs(op(&stringSetPos_MBCS_nonmodal), op(&stringSetPos_MBCS_nonmodal_EUC_JP),
+              op(&stringSetPos_MBCS_nonmodal_EUC_TW), op(&stringSetPos_MBCS_nonmodal_GB18030))}},
+    Row{20,  // stringNextChar
+        {same(op(&stringNextChar_SBCS)), same(op(&stringNextChar_UTF8)),
+         same(op(&stringNextChar_WCS2)), same(op(&stringNextChar_WCS4)),
+         same(op(&stringNextChar_MBCS_modal)),
+         dbcs(op(&stringNextChar_MBCS_nonmodal), op(&stringNextChar_MBCS_nonmodal_EUC_JP),
+              op(&stringNextChar_MBCS_nonmodal_EUC_TW),
+              op(&stringNextChar_MBCS_nonmodal_GB18030))}},
     every_class(21, op(&stringNextCharB)),
+    Row{26,  // stringCurCharSize
+        {same(op(&stringCurCharSize_FixedSize)), same(op(&stringCurCharSize_UTF8)),
+         same(op(&stringCurCharSize_WCS2)), same(op(&stringCurCharSize_FixedSize)),
+         same(op(&stringCurCharSize_MBCS_modal)), same(op(&stringCurCharSize_MBCS_nonmodal))}},
+    Row{40,  // NLSStringByteLength
+        {same(op(&NLSStringByteLength_SBCS)),
+         utf(op(&NLSStringByteLength_UTF8), op(&NLSStringByteLength_UTFE)),
+         same(op(&NLSStringByteLength_WCS2)), same(op(&NLSStringByteLength_WCS4)),
+         same(op(&NLSStringByteLength_MBCS_modal)),
+         dbcs(op(&NLSStringByteLength_MBCS_nonmodal), op(&NLSStringByteLength_MBCS_EUC_JP),
+              op(&NLSStringByteLength_MBCS_EUC_TW), op(&NLSStringByteLength_MBCS_GB18030))}},
+    Row{48,  // NLSNumCharsS
+        {same(op(&NLSNumCharsS_SBCS)), utf(op(&NLSNumCharsS_UTF8), op(&NLSNumCharsS_UTFE)),
+         same(op(&NLSNumCharsS_WCS2)), same(op(&NLSNumCharsS_WCS4)),
+         same(op(&NLSNumCharsS_MBCS_modal)),
+         dbcs(op(&NLSNumCharsS_MBCS_nonmodal), op(&NLSNumCharsS_MBCS_EUC_JP),
+              op(&NLSNumCharsS_MBCS_EUC_TW), op(&NLSNumCharsS_MBCS_GB18030))}},
+    Row{49,  // NLSBlankPadS
+        {same(op(&NLSBlankPadS_SBCS)), same(op(&NLSBlankPadS)), same(op(&NLSBlankPadS_WCS)),
+         same(op(&NLSBlankPadS_WCS)), same(op(&NLSBlankPadS)), same(op(&NLSBlankPadS))}},
+    Row{50,  // NLSAllBlanksS
+        {same(op(&NLSAllBlanksS_SBCS)), same(op(&NLSAllBlanksS)), same(op(&NLSAllBlanksS_WCS)),
+         same(op(&NLSAllBlanksS_WCS)), same(op(&NLSAllBlanksS_MBCS_modal)),
+         same(op(&NLSAllBlanksS))}},
+    Row{72,  // NLSStringLength
+        {same(op(&NLSStringLength_SBCS)), utf(op(&NLSStringLength_UTF8), op(&NLSStringLength_UTFE)),
+         same(op(&NLSStringLength_WCS2)), same(op(&NLSStringLength_WCS4)),
+         same(op(&NLSStringLength_MBCS_modal)),
+         dbcs(op(&NLSStringLength_MBCS_nonmodal), op(&NLSStringLength_MBCS_EUC_JP),
+              op(&NLSStringLength_MBCS_EUC_TW), op(&NLSStringLength_MBCS_GB18030))}},
+    Row{101,  // NLSStringNLength
+        {same(op(&NLSStringNLength_SBCS)), same(op(&NLSStringNLength_UTF8)),
+         same(op(&NLSStringNLength_WCS2)), same(op(&NLSStringNLength_WCS4)),
+         same(op(&NLSStringNLength_MBCS_modal)),
+         dbcs(op(&NLSStringNLength_MBCS_nonmodal), op(&NLSStringNLength_MBCS_EUC_JP),
+              op(&NLSStringNLength_MBCS_EUC_TW), op(&NLSStringNLength_MBCS_GB18030))}},
+    Row{102,  // NLSStringBLength
+        {same(op(&NLSStringBLength_SBCS)), same(op(&NLSStringBLength_UTF8)),
+         same(op(&NLSStringBLength_WCS2)), same(op(&NLSStringBLength_WCS4)),
+         same(op(&NLSStringBLength_MBCS_modal)),
+         dbcs(op(&NLSStringBLength_MBCS_nonmodal), op(&NLSStringBLength_MBCS_EUC_JP),
+              op(&NLSStringBLength_MBCS_EUC_TW), op(&NLSStringBLength_MBCS_GB18030))}},
+    Row{114,  // NLSStringByteLengthC
+        {same(op(&NLSStringByteLengthC_SBCS)), same(op(&NLSStringByteLengthC_UTF8)),
+         same(op(&NLSStringByteLengthC_WCS2)), same(op(&NLSStringByteLengthC_WCS4)),
+         same(op(&NLSStringByteLengthC_MBCS_modal)),
+         dbcs(op(&NLSStringByteLengthC_MBCS_nonmodal), op(&NLSStringByteLengthC_MBCS_EUC_JP),
+              op(&NLSStringByteLengthC_MBCS_EUC_TW), op(&NLSStringByteLengthC_MBCS_GB18030))}},
 };
 
 bool is_class_independent(const Row &row) {
