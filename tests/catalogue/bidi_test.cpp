@@ -1,0 +1,85 @@
+// The single-byte bidirectional tables and their selection by encoding number.
+#include <gtest/gtest.h>
+
+#include <climits>
+#include <set>
+#include <string>
+
+#include "catalogue/tables.hpp"
+#include "nlssm/nlssm.h"
+
+namespace nlssm::catalogue {
+namespace {
+
+const BidiTable *selected(int32_t number) {
+  return reinterpret_cast<const BidiTable *>(NLSGetBIDICategorySBCSTab(number));
+}
+
+TEST(BidiTables, SelectionByEncodingNumber) {
+  const std::set<int> numbers = {34, 36, 46,  47,  55,  65,  66,  70,  71,
+                                 86, 87, 101, 102, 201, 202, 207, 208, 229};
+  for (int32_t n = -1; n <= 300; ++n) {
+    EXPECT_EQ(selected(n) != nullptr, numbers.count(n) == 1) << n;
+  }
+  EXPECT_EQ(selected(INT32_MIN), nullptr);
+  EXPECT_EQ(selected(34), &bidi_arab);
+  EXPECT_EQ(selected(87), &bidi_e424);
+  EXPECT_EQ(selected(102), &bidi_eoiw);
+  EXPECT_EQ(selected(229), &bidi_p098);
+  std::set<const BidiTable *> tables;
+  for (const BidiSelection &s : bidi_selection) tables.insert(s.table);
+  EXPECT_EQ(tables.size(), 18u);
+}
+
+TEST(BidiTables, SharedClassesAndStructure) {
+  const std::set<uint32_t> values = {0, 3, 4, 8, 10, 12, 17, 110, 112, kBidiNone};
+  for (const BidiSelection &s : bidi_selection) {
+    SCOPED_TRACE(s.name);
+    const BidiTable &t = *s.table;
+    const bool ebcdic = s.name[0] == 'e';
+    const int blank = ebcdic ? 0x40 : ' ', zero = ebcdic ? 0xF0 : '0', upperA = ebcdic ? 0xC1 : 'A';
+    EXPECT_EQ(t.categories[blank], kBidiWS);
+    EXPECT_EQ(t.categories[0x0C], kBidiWS);  // form feed, at the same byte in both families
+    for (int d = 0; d < 10; ++d) EXPECT_EQ(t.categories[zero + d], kBidiEN);
+    for (int l = 0; l < 9; ++l) EXPECT_EQ(t.categories[upperA + l], kBidiL);
+    if (!ebcdic) {
+      for (int b : {'#', '$', '%'}) EXPECT_EQ(t.categories[b], kBidiAsciiET) << b;
+      for (int b : {',', '.', '/', ':'}) EXPECT_EQ(t.categories[b], kBidiAsciiCS) << b;
+      for (int b = 'a'; b <= 'z'; ++b) EXPECT_EQ(t.categories[b], kBidiL) << b;
+    }
+    int strongRightToLeft = 0;
+    for (int b = 0; b < 256; ++b) {
+      EXPECT_EQ(values.count(t.categories[b]), 1u) << b;
+      // The second table is a reduced copy of the first.
+      EXPECT_TRUE(t.reorder[b] == t.categories[b] || t.reorder[b] == kBidiNone) << b;
+      strongRightToLeft += t.categories[b] == kBidiR || t.categories[b] == kBidiAL;
+    }
+    EXPECT_GE(strongRightToLeft, 22);  // the letters of the script
+    for (int i = 0; i < 8; ++i) EXPECT_EQ(t.mirrors[i], t.brackets[i ^ 1]) << i;
+  }
+}
+
+TEST(BidiTables, WorkedExamples) {
+  // Hebrew letters of EBCDIC 424.
+  for (int b = 0x41; b <= 0x71; ++b) {
+    const bool letter =
+        (b <= 0x49) || (b >= 0x51 && b <= 0x59) || (b >= 0x62 && b <= 0x69) || b == 0x71;
+    EXPECT_EQ(bidi_e424.categories[b] == kBidiR, letter) << b;
+  }
+  EXPECT_EQ(bidi_e424.categories[0x81], kBidiL);  // lower-case a
+  // ISO 8859-8: the reduced table drops the form feed and 0x7B-0xDF, and
+  // keeps the letters, digits, blank and ASCII punctuation.
+  EXPECT_EQ(bidi_hebr.categories[0xA0], kBidiCS);  // no-break space
+  EXPECT_EQ(bidi_hebr.categories[0xB5], kBidiL);   // micro sign
+  EXPECT_EQ(bidi_hebr.categories[0xB2], kBidiEN);  // superscript two
+  EXPECT_EQ(bidi_hebr.reorder[0x0C], kBidiNone);
+  for (int b = 0x7B; b <= 0xDF; ++b) EXPECT_EQ(bidi_hebr.reorder[b], kBidiNone) << b;
+  for (int b = 0x20; b < 0x7B; ++b) EXPECT_EQ(bidi_hebr.reorder[b], bidi_hebr.categories[b]);
+  for (int b = 0xE0; b <= 0xFA; ++b) EXPECT_EQ(bidi_hebr.reorder[b], kBidiR) << b;
+  EXPECT_EQ(bidi_arab.categories[0xC7], kBidiAL);  // alef
+  EXPECT_EQ(0,
+            std::string(reinterpret_cast<const char *>(bidi_hebr.brackets), 8).compare("()[]{}<>"));
+}
+
+}  // namespace
+}  // namespace nlssm::catalogue
