@@ -642,8 +642,9 @@ NLSSM_API int64_t NLSNumCharsS_MBCS_GB18030(const NLSSMHandle *handle, const uin
 /* Lengths of zero-terminated text (slots 72, 101), in characters and bytes
  * (either output may be null); the byte lengths of characters (slots 102,
  * 40, 114). NLSStringBLength: bytes of the first charCount characters (the
- * text must hold them), or with a negative count of the whole text up to
- * its terminating zero unit. */
+ * text must hold them; a last character that could pair with the next unit
+ * reads that unit), or with a negative count of the whole text up to its
+ * terminating zero unit. */
 NLSSM_API int64_t NLSStringLength_SBCS(const NLSSMHandle *handle, const uint8_t *text,
                                        int64_t *charCount, int64_t *byteCount, int64_t flags);
 NLSSM_API int64_t NLSStringByteLength_SBCS(const NLSSMHandle *handle, const NLSString *string,
