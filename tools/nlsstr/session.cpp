@@ -1,0 +1,167 @@
+#include "session.hpp"
+
+#include <nlssm/host.h>
+
+#include <cstdio>
+#include <fstream>
+#include <iostream>
+#include <iterator>
+#include <sstream>
+
+namespace nlsstr {
+namespace {
+
+template <typename Fn>
+Fn slot_of(void *object, int n) {
+  return reinterpret_cast<Fn>(NLSSM_HOST_SLOT(object, n));
+}
+
+int hex_digit(char c) {
+  if (c >= '0' && c <= '9') return c - '0';
+  if (c >= 'a' && c <= 'f') return c - 'a' + 10;
+  if (c >= 'A' && c <= 'F') return c - 'A' + 10;
+  return -1;
+}
+
+std::vector<uint8_t> parse_hex(const std::string &text) {
+  std::vector<uint8_t> bytes;
+  int high = -1;
+  for (char c : text) {
+    if (c == ' ' || c == ':' || c == ',') continue;
+    const int digit = hex_digit(c);
+    if (digit < 0) throw Failure("not a hex digit in --hex: '" + std::string(1, c) + "'");
+    if (high < 0) {
+      high = digit;
+    } else {
+      bytes.push_back(static_cast<uint8_t>(high * 16 + digit));
+      high = -1;
+    }
+  }
+  if (high >= 0) throw Failure("--hex needs an even number of digits");
+  return bytes;
+}
+
+}  // namespace
+
+std::string status_name(int64_t status) {
+  static const std::map<int64_t, std::string> names = {
+      {NLSSM_E_NO_MEMORY, "NLSSM_E_NO_MEMORY"},
+      {NLSSM_E_UNSUPPORTED, "NLSSM_E_UNSUPPORTED"},
+      {NLSSM_E_DEST_TOO_SMALL, "NLSSM_E_DEST_TOO_SMALL"},
+      {NLSSM_E_ILL_FORMED, "NLSSM_E_ILL_FORMED"},
+      {NLSSM_E_ENCODING, "NLSSM_E_ENCODING"},
+      {NLSSM_E_NUMBER_DOES_NOT_FIT, "NLSSM_E_NUMBER_DOES_NOT_FIT"},
+      {NLSSM_E_NOT_A_NUMBER, "NLSSM_E_NOT_A_NUMBER"},
+      {NLSSM_E_INT_OVERFLOW, "NLSSM_E_INT_OVERFLOW"},
+      {NLSSM_E_TRUNCATED_SEQUENCE, "NLSSM_E_TRUNCATED_SEQUENCE"},
+      {NLSSM_E_NUMBER_TOO_LONG, "NLSSM_E_NUMBER_TOO_LONG"},
+      {NLSSM_E_NULL_ARGUMENT, "NLSSM_E_NULL_ARGUMENT"},
+      {NLSSM_E_BAD_CHARACTER, "NLSSM_E_BAD_CHARACTER"},
+      {NLSSM_E_BAD_OPTIONS, "NLSSM_E_BAD_OPTIONS"},
+      {NLSSM_E_BAD_ARGUMENT, "NLSSM_E_BAD_ARGUMENT"},
+      {NLSSM_E_BAD_ALIGNMENT, "NLSSM_E_BAD_ALIGNMENT"},
+  };
+  const auto found = names.find(status);
+  return found == names.end() ? std::string() : found->second;
+}
+
+void check(int64_t status, const std::string &what) {
+  if (status != 0) throw Failure(what + " failed", status);
+}
+
+std::string hex(const uint8_t *bytes, size_t length) {
+  std::string out;
+  char buffer[4];
+  for (size_t i = 0; i < length; ++i) {
+    std::snprintf(buffer, sizeof buffer, i ? " %02X" : "%02X", bytes[i]);
+    out += buffer;
+  }
+  return out;
+}
+
+std::string Arguments::option(const std::string &name, const std::string &fallback) const {
+  const auto found = options.find(name);
+  return found == options.end() ? fallback : found->second;
+}
+
+Session::Session() : host_(nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module())) {
+  if (host_->module() == nullptr) throw Failure("the module could not be started");
+}
+
+Session::~Session() = default;
+
+int Session::encoding_number(const std::string &encoding) const {
+  if (!encoding.empty() && encoding.find_first_not_of("0123456789") == std::string::npos)
+    return std::stoi(encoding);
+  const int number = nlssm::refhost::ReferenceHost::registry().lookup(encoding);
+  if (number < 0) throw Failure("unknown encoding '" + encoding + "'");
+  return number;
+}
+
+const NLSSMHandle *Session::handle(const std::string &encoding) {
+  NLSSMHandle *handle = nullptr;
+  check(host_->create_handle(encoding_number(encoding), &handle),
+        "creating a handle for encoding " + encoding);
+  if (handle == nullptr) throw Failure("no handle for encoding " + encoding);
+  return handle;
+}
+
+std::vector<uint8_t> Session::convert(int64_t from, int64_t to,
+                                      const std::vector<uint8_t> &text) const {
+  void *nls = host_->nls();
+  void *converter = slot_of<NLSHostConverterBetweenFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_BETWEEN)(
+      nls, from, to, nullptr, nullptr);
+  if (converter == nullptr) throw Failure("no converter between the encodings", NLSSM_E_ENCODING);
+  std::vector<uint8_t> out(text.size() * 4 + 16);
+  uint64_t produced = 0;
+  const int64_t status =
+      slot_of<NLSHostConverterConvertFn>(converter, NLSHOST_SLOT_CONVERTER_CONVERT)(
+          converter, text.data(), text.size(), out.data(), out.size(), &produced, nullptr);
+  slot_of<NLSHostConverterDestroyFn>(converter, NLSHOST_SLOT_CONVERTER_DESTROY)(converter);
+  check(status, "converting the text");
+  out.resize(produced);
+  return out;
+}
+
+std::vector<uint8_t> Session::input(const NLSSMHandle *handle, const Arguments &args) {
+  if (args.has("text")) {
+    const std::string &utf8 = args.options.at("text");
+    return convert(NLSSM_ENC_UTF8, handle->encodingNumber,
+                   std::vector<uint8_t>(utf8.begin(), utf8.end()));
+  }
+  if (args.has("hex")) return parse_hex(args.options.at("hex"));
+  if (args.has("file")) {
+    std::ifstream file(args.options.at("file"), std::ios::binary);
+    if (!file) throw Failure("cannot read " + args.options.at("file"));
+    return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
+  }
+  return {std::istreambuf_iterator<char>(std::cin), std::istreambuf_iterator<char>()};
+}
+
+OutputForm Session::output_form(const Arguments &args) {
+  const std::string form = args.option("out", "utf8");
+  if (form == "utf8") return OutputForm::kUtf8;
+  if (form == "hex") return OutputForm::kHex;
+  if (form == "raw") return OutputForm::kRaw;
+  throw Failure("--out takes utf8, hex or raw");
+}
+
+void Session::print_text(const NLSSMHandle *handle, const std::vector<uint8_t> &text,
+                         OutputForm form) const {
+  switch (form) {
+    case OutputForm::kRaw:
+      std::cout.write(reinterpret_cast<const char *>(text.data()), text.size());
+      return;
+    case OutputForm::kHex:
+      std::cout << hex(text.data(), text.size()) << '\n';
+      return;
+    case OutputForm::kUtf8: {
+      const std::vector<uint8_t> utf8 = convert(handle->encodingNumber, NLSSM_ENC_UTF8, text);
+      std::cout.write(reinterpret_cast<const char *>(utf8.data()), utf8.size());
+      std::cout << '\n';
+      return;
+    }
+  }
+}
+
+}  // namespace nlsstr
