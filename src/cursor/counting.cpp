@@ -493,15 +493,21 @@ extern "C" int64_t NLSStringLength_WCS4(const NLSSMHandle *, const uint8_t *text
   return 0;
 }
 
-extern "C" int64_t NLSStringLength_WCS2(const NLSSMHandle *h, const uint8_t *text,
-                                        int64_t *charCount, int64_t *byteCount, int64_t) {
+// WCS2 text up to its zero unit or the byte limit: surrogate pairs count once.
+static int64_t wcs2_length(const NLSSMHandle *h, const uint8_t *text, int64_t byteLimit,
+                           int64_t *charCount, int64_t *byteCount) {
   store(charCount, 0);
   store(byteCount, 0);
   if (text == nullptr) return kNullArgument;
-  const int64_t bytes = units_to_zero(text, 2, kNoLimit) * 2;
+  const int64_t bytes = units_to_zero(text, 2, byteLimit) * 2;
   store(charCount, count_wcs2(active_isa(), text, bytes, big_wcs2(h)));
   store(byteCount, bytes);
   return 0;
+}
+
+extern "C" int64_t NLSStringLength_WCS2(const NLSSMHandle *h, const uint8_t *text,
+                                        int64_t *charCount, int64_t *byteCount, int64_t) {
+  return wcs2_length(h, text, kNoLimit, charCount, byteCount);
 }
 
 // The byte length runs to the first zero byte; the characters are walked by
@@ -616,13 +622,7 @@ extern "C" int64_t NLSStringNLength_WCS4(const NLSSMHandle *, const uint8_t *tex
 extern "C" int64_t NLSStringNLength_WCS2(const NLSSMHandle *h, const uint8_t *text,
                                          int64_t byteLimit, int64_t *charCount,
                                          int64_t *byteCount) {
-  store(charCount, 0);
-  store(byteCount, 0);
-  if (text == nullptr) return kNullArgument;
-  const int64_t bytes = units_to_zero(text, 2, byteLimit) * 2;
-  store(charCount, count_wcs2(active_isa(), text, bytes, big_wcs2(h)));
-  store(byteCount, bytes);
-  return 0;
+  return wcs2_length(h, text, byteLimit, charCount, byteCount);
 }
 
 // A character counts only when its last byte lies inside the limit.
