@@ -935,4 +935,47 @@ NLSSM_API int64_t isLegalUTF8(const uint8_t *bytes, int64_t length, int64_t *bad
  * `count` units. */
 NLSSM_API int64_t GET_UTF8_LEN_FROM_QVCHAR(const uint32_t *chars, int64_t count);
 
+/* Handle-bound converters: one character of a UTF-8 or UTF-EBCDIC handle's
+ * text to a 32-bit code point (the machine's order) and back, through the
+ * UTF transcoders of the host NLS object in the handle's `owner`. These take
+ * no length: the lead byte alone says how many bytes are read, so a caller
+ * whose text may end inside a character pads it as stated. */
+
+/* UTF-8 -> code point. Hands the lead byte and the 0-5 bytes it announces
+ * (C0-DF 1, E0-EF 2, F0-F7 3, F8-FB 4, FC-FF 5) to the host; answers that
+ * byte count, or 0 when the host rejects them (bad continuation, overlong,
+ * surrogate, above U+10FFFF, a stray continuation byte). Reads up to 6 bytes:
+ * up to 5 past the lead, whatever the text's length. A null source or
+ * destination answers 0. */
+NLSSM_API int64_t FromUTF8(const NLSSMHandle *handle, const uint8_t *source, uint32_t *codePoint);
+/* UTF-EBCDIC -> code point, as FromUTF8: the lead byte announces 0-4 more
+ * bytes (reads up to 5 bytes: up to 4 past the lead). A trailing byte or an
+ * unused lead answers 0 and leaves the destination unwritten. */
+NLSSM_API int64_t FromUTFE(const NLSSMHandle *handle, const uint8_t *source, uint32_t *codePoint);
+/* Code point -> UTF-8. Answers the length of the code point's form, 1 (below
+ * 0x80), 2, 3 (below 0x10000), 4 (below 0x200000), 5 (below 0x4000000) or 6,
+ * and lets the host write at most that many bytes; a value the host cannot
+ * encode (a surrogate, above U+10FFFF) leaves the destination unwritten and
+ * still answers its length. The destination takes up to 6 bytes. A null
+ * destination answers 0. */
+NLSSM_API int64_t ToUTF8(const NLSSMHandle *handle, uint32_t codePoint, uint8_t *destination);
+/* Code point -> UTF-EBCDIC, as ToUTF8 with lengths 1 (below 0xA0), 2 (below
+ * 0x400), 3 (below 0x4000), 4 (below 0x40000) or 5; up to 5 bytes. */
+NLSSM_API int64_t ToUTFE(const NLSSMHandle *handle, uint32_t codePoint, uint8_t *destination);
+
+/* GetNumBytes: the target of `count` characters lies outside the text. */
+#define NLSSM_GETNUMBYTES_OUTSIDE 0xFFFFFF9Du
+/* Bytes from the descriptor's current character to the start of the
+ * character `count` characters on, found by moving a copy of the descriptor
+ * through the handle's stringSetPos (any class). `state` (may be null)
+ * receives that character's charKind (modal text: its shift state). Count 0:
+ * the bytes up to `length`, and the descriptor's own charKind. When the
+ * target lies past the text (including exactly one past its last character)
+ * `byteCount` gets the bytes up to `length`, `state` is not written and the
+ * result is NLSSM_GETNUMBYTES_OUTSIDE. The fourth argument is ignored. Null
+ * handle, descriptor or byteCount: NLSSM_E_NULL_ARGUMENT. Reads the text as
+ * the handle's stringSetPos does. */
+NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string, int64_t count,
+                              int64_t reserved, int64_t *byteCount, uint32_t *state);
+
 #endif /* NLSSM_NLSSM_H */
