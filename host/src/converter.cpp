@@ -216,7 +216,26 @@ std::int64_t converter_convert(void *object, const void *source, std::uint64_t s
   return status;
 }
 
+// Shared converters belong to the NLS object: a caller's destroy leaves them.
+void shared_converter_destroy(void *) {}
+
 }  // namespace
+
+void *new_shared_converter_object(const EncodingInfo &from, const EncodingInfo &to) {
+  static ObjectCounters uncounted;
+  auto *converter = new ConverterObject(from, to, uncounted);
+  if (!converter->transcoder.ok()) {
+    delete converter;
+    return nullptr;
+  }
+  converter->slots.set(NLSHOST_SLOT_CONVERTER_DESTROY, &shared_converter_destroy);
+  converter->slots.set(NLSHOST_SLOT_CONVERTER_CONVERT, &converter_convert);
+  return converter;
+}
+
+void destroy_shared_converter_object(void *object) {
+  delete self<ConverterObject>(object);
+}
 
 void *new_converter_object(const EncodingInfo &from, const EncodingInfo &to,
                            ObjectCounters &counters) {

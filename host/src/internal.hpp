@@ -46,6 +46,11 @@ class Transcoder {
 };
 
 // The converter object handed to the module (slots 2 destroy, 4 convert).
+// A converter owned by the NLS object, for encodings that need no
+// conversion between them: callers may use and "destroy" it freely; the NLS
+// object releases it. Not counted among live converters.
+void *new_shared_converter_object(const EncodingInfo &from, const EncodingInfo &to);
+void destroy_shared_converter_object(void *object);
 void *new_converter_object(const EncodingInfo &from, const EncodingInfo &to,
                            ObjectCounters &counters);
 

@@ -20,6 +20,10 @@ struct NlsObject {
   // Transcoders behind the size query, one per pair of encodings.
   std::mutex sizeMutex;
   std::map<std::pair<int, int>, std::unique_ptr<Transcoder>> sizers;
+  // Converters between encodings that need no conversion: handed out to
+  // every caller (a handle borrows them) and released with the NLS object.
+  std::mutex sharedMutex;
+  std::map<std::pair<int, int>, void *> shared;
 };
 
 NlsObject *nls_of(void *object) {
@@ -55,7 +59,14 @@ void *converter_between(void *object, std::int64_t from, std::int64_t to, void *
   const EncodingInfo *source = described(from);
   const EncodingInfo *target = described(to);
   if (source == nullptr || target == nullptr) return nullptr;
-  return new_converter_object(*source, *target, *nls_of(object)->counters);
+  NlsObject *nls = nls_of(object);
+  if (!conversion_needed(object, from, to, nullptr)) {
+    std::lock_guard lock(nls->sharedMutex);
+    void *&converter = nls->shared[{source->number, target->number}];
+    if (converter == nullptr) converter = new_shared_converter_object(*source, *target);
+    return converter;
+  }
+  return new_converter_object(*source, *target, *nls->counters);
 }
 
 void *converter_from(void *object, std::int64_t encoding, void *, void *) {
@@ -138,6 +149,8 @@ void destroy_nls_object(void *object) {
   NlsObject *nls = nls_of(object);
   destroy_table_object(nls->slots.words[NLSHOST_WORD_NLS_HANDLE_TABLE], nls->destroyCallback);
   destroy_lock_object(nls->slots.words[NLSHOST_WORD_NLS_TABLE_LOCK]);
+  for (auto &entry : nls->shared)
+    if (entry.second != nullptr) destroy_shared_converter_object(entry.second);
   delete nls;
 }
 
