@@ -60,10 +60,11 @@ TEST(UtfTranscoders, EveryCodePointRoundTrips) {
 TEST(UtfTranscoders, KnownUtfEbcdicForms) {
   auto host = standalone();
   std::string out;
-  ASSERT_EQ(
-      transcode(host->nls(), NLSHOST_SLOT_NLS_INTERMEDIATE_TO_UTFE, utf16(u"A\u00A0\uFEFF"), out),
-      0);
-  EXPECT_EQ(out, "\xC1\x80\x41\xDD\x73\x66\x73");
+  ASSERT_EQ(transcode(host->nls(), NLSHOST_SLOT_NLS_INTERMEDIATE_TO_UTFE,
+                      utf16(u"A\u00A0\uFEFF\n\u0085"), out),
+            0);
+  // Line feed is 0x15 and next line 0x25, as in the module's own tables.
+  EXPECT_EQ(out, "\xC1\x80\x41\xDD\x73\x66\x73\x15\x25");
 }
 
 TEST(UtfTranscoders, BadAndShortInput) {
