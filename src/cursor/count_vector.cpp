@@ -5,7 +5,7 @@
 #include <immintrin.h>
 
 #include "cursor/char_model.hpp"
-#include "cursor/cpu_features.hpp"
+#include "kernel/cpu.hpp"
 
 namespace nlssm::cursor::simd {
 
@@ -132,7 +132,7 @@ struct V {
 #endif
 
 Isa best_isa() {
-  return cpu_has_avx2() ? Isa::kAvx2 : Isa::kSse2;
+  return kernel::cpu::supports(kernel::cpu::Isa::avx2) ? Isa::kAvx2 : Isa::kSse2;
 }
 
 Prefix utf8_prefix(Isa isa, const uint8_t *p, int64_t n, int64_t limit) {

@@ -10,7 +10,8 @@ uint32_t detect() noexcept {
   // dispatch that runs from another constructor may come first.
   __builtin_cpu_init();
   uint32_t features = 0;
-  if (__builtin_cpu_supports("avx2")) features |= kAvx2;
+  // The AVX2 paths also count bits with popcnt, which every AVX2 processor has.
+  if (__builtin_cpu_supports("avx2") && __builtin_cpu_supports("popcnt")) features |= kAvx2;
   return features;
 }
 
