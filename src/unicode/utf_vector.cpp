@@ -3,6 +3,7 @@
 // UTF-32 loop of the decoding driver (SSE2 for ASCII runs).
 #include <emmintrin.h>
 #include <immintrin.h>
+#include "kernel/cpu.hpp"
 
 #include <atomic>
 #include <cstring>
@@ -93,8 +94,7 @@ __attribute__((target("avx2"))) int64_t utf8_length_avx2(const uint32_t *chars, 
 }
 
 bool avx2_usable() {
-  __builtin_cpu_init();
-  return __builtin_cpu_supports("avx2");
+  return kernel::cpu::supports(kernel::cpu::Isa::avx2);
 }
 
 int64_t utf8_length(const uint32_t *chars, int64_t count) {
