@@ -510,6 +510,25 @@ extern "C" int64_t NLSStringLength_WCS2(const NLSSMHandle *h, const uint8_t *tex
   return wcs2_length(h, text, kNoLimit, charCount, byteCount);
 }
 
+// Counts the characters of n bytes by a lead-byte length table (0 = cannot
+// start a character); a bad or cut-off character ends the count.
+template <typename Table>
+static int64_t count_by_lead_table(const uint8_t *text, int64_t n, const Table &lengths,
+                                   int64_t *charCount) {
+  int64_t chars = 0;
+  int64_t status = 0;
+  for (int64_t off = 0; off < n; ++chars) {
+    const int64_t size = lengths[text[off]];
+    if (size == 0 || off + size > n) {
+      status = kBadCharacter;
+      break;
+    }
+    off += size;
+  }
+  store(charCount, chars);
+  return status;
+}
+
 // The byte length runs to the first zero byte; the characters are walked by
 // the lead-length table. With flags and no character count wanted, only
 // the tail is checked: an incomplete last character is left out of the
@@ -533,18 +552,7 @@ extern "C" int64_t NLSStringLength_UTF8(const NLSSMHandle *, const uint8_t *text
     return 0;
   }
   store(byteCount, n);
-  int64_t chars = 0;
-  int64_t status = 0;
-  for (int64_t off = 0; off < n; ++chars) {
-    const int64_t size = kUtf8LeadLength[text[off]];
-    if (size == 0 || off + size > n) {
-      status = kBadCharacter;
-      break;
-    }
-    off += size;
-  }
-  store(charCount, chars);
-  return status;
+  return count_by_lead_table(text, n, kUtf8LeadLength, charCount);
 }
 
 extern "C" int64_t NLSStringLength_UTFE(const NLSSMHandle *, const uint8_t *text,
@@ -554,18 +562,7 @@ extern "C" int64_t NLSStringLength_UTFE(const NLSSMHandle *, const uint8_t *text
   if (text == nullptr) return kNullArgument;
   const int64_t n = strlen8(text);
   store(byteCount, n);
-  int64_t chars = 0;
-  int64_t status = 0;
-  for (int64_t off = 0; off < n; ++chars) {
-    const int64_t size = kSkipUtfe[text[off]];
-    if (size == 0 || off + size > n) {
-      status = kBadCharacter;
-      break;
-    }
-    off += size;
-  }
-  store(charCount, chars);
-  return status;
+  return count_by_lead_table(text, n, kSkipUtfe, charCount);
 }
 
 #define NLSSM_LENGTH_BY_MODEL(suffix, Model)                                                     \
