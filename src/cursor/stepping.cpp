@@ -32,11 +32,9 @@ int64_t next_char_cached(const NLSSMHandle *h, NLSString *s) {
   return s->charIndex;
 }
 
-// Modal, EUC-JP, EUC-TW, GB18030: a step is a relative move by one through
-// the handle's stringSetPos; the step off the last character parks here.
-int64_t next_char_through_set_pos(const NLSSMHandle *h, NLSString *s) {
-  if (s->curOffset < 0) return kNone;
-  if (s->nextOffset != kNone) return reinterpret_cast<SetPosFn>(h->stringSetPos)(h, s, kCurrent, 1);
+// The step off the last character of a multi-byte text: the last character
+// becomes the previous one and no character is current.
+int64_t park_past_end(NLSString *s) {
   s->prevOffset = s->curOffset;
   s->prevKind = s->charKind;
   ++s->charIndex;
@@ -45,6 +43,14 @@ int64_t next_char_through_set_pos(const NLSSMHandle *h, NLSString *s) {
   s->curOffset = kNone;
   s->nextOffset = kNone;
   return kNone;
+}
+
+// Modal, EUC-JP, EUC-TW, GB18030: a step is a relative move by one through
+// the handle's stringSetPos; the step off the last character parks here.
+int64_t next_char_through_set_pos(const NLSSMHandle *h, NLSString *s) {
+  if (s->curOffset < 0) return kNone;
+  if (s->nextOffset != kNone) return reinterpret_cast<SetPosFn>(h->stringSetPos)(h, s, kCurrent, 1);
+  return park_past_end(s);
 }
 
 // Fixed-width classes position by arithmetic.
@@ -160,14 +166,7 @@ extern "C" int64_t stringNextChar_MBCS_nonmodal(const NLSSMHandle *h, NLSString 
   if (s->curOffset < 0) return kNone;
   const auto length = static_cast<int64_t>(s->length);
   if (s->nextOffset < 0 || s->nextOffset >= length) {
-    s->prevOffset = s->curOffset;
-    s->prevKind = s->charKind;
-    ++s->charIndex;
-    s->charKind = 0;
-    s->nextCharKind = 0;
-    s->curOffset = kNone;
-    s->nextOffset = kNone;
-    return kNone;
+    return park_past_end(s);
   }
   s->prevOffset = s->curOffset;
   s->curOffset = s->nextOffset;
