@@ -182,24 +182,27 @@ extern "C" int64_t NLSBlankPad_MBCS_modal(const NLSSMHandle *h, int64_t byteCoun
 
 // ---- NLSBlankPadS --------------------------------------------------------
 
-extern "C" int64_t NLSBlankPadS(const NLSSMHandle *h, uint8_t *p, int64_t byteCount, int64_t,
-                                int64_t *written) {
+// Fills byteCount bytes with the one-byte blank; `emptyStatus` answers a
+// destination with no room, where the members differ.
+static int64_t pad_single_byte_blanks(const NLSSMHandle *h, uint8_t *p, int64_t byteCount,
+                                      int64_t *written, int64_t emptyStatus) {
   store(written, 0);
-  if (byteCount <= 0) return kDestTooSmall;
+  if (byteCount <= 0) return emptyStatus;
   if (p == nullptr) return kNullArgument;
   std::memset(p, h->blankChar[0], static_cast<size_t>(byteCount));
   store(written, byteCount);
   return 0;
 }
 
+extern "C" int64_t NLSBlankPadS(const NLSSMHandle *h, uint8_t *p, int64_t byteCount, int64_t,
+                                int64_t *written) {
+  return pad_single_byte_blanks(h, p, byteCount, written, kDestTooSmall);
+}
+
+// An empty destination is nothing to pad, and no error, for single-byte text.
 extern "C" int64_t NLSBlankPadS_SBCS(const NLSSMHandle *h, uint8_t *p, int64_t byteCount, int64_t,
                                      int64_t *written) {
-  store(written, 0);
-  if (byteCount <= 0) return 0;
-  if (p == nullptr) return kNullArgument;
-  std::memset(p, h->blankChar[0], static_cast<size_t>(byteCount));
-  store(written, byteCount);
-  return 0;
+  return pad_single_byte_blanks(h, p, byteCount, written, 0);
 }
 
 extern "C" int64_t NLSBlankPadS_WCS(const NLSSMHandle *h, uint8_t *p, int64_t byteCount, int64_t,
