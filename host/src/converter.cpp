@@ -97,14 +97,8 @@ struct Transcoder::Side {
     while (at < length) {
       std::uint32_t c = 0;
       std::size_t used = 0;
-      switch (utfe::decode(source + at, length - at, c, used)) {
-        case utfe::Decode::IllFormed:
-          return NLSHOST_E_ILL_FORMED;
-        case utfe::Decode::Truncated:
-          return NLSHOST_E_TRUNCATED;
-        case utfe::Decode::Ok:
-          break;
-      }
+      if (const std::int64_t status = utfe::decode_status(source + at, length - at, c, used))
+        return static_cast<std::uint32_t>(status);
       if (c > 0xFFFF) {
         out.push_back(static_cast<char16_t>(U16_LEAD(c)));
         out.push_back(static_cast<char16_t>(U16_TRAIL(c)));

@@ -1,5 +1,6 @@
 // UTF-EBCDIC encoder and decoder.
 #include "utf_ebcdic.hpp"
+#include <nlssm/host.h>
 
 #include <array>
 
@@ -108,6 +109,19 @@ Decode decode(const std::uint8_t *text, std::size_t length, std::uint32_t &chara
     return Decode::IllFormed;
   character = value;
   return Decode::Ok;
+}
+
+std::int64_t decode_status(const std::uint8_t *text, std::size_t length, std::uint32_t &character,
+                           std::size_t &used) {
+  switch (decode(text, length, character, used)) {
+    case Decode::IllFormed:
+      return NLSHOST_E_ILL_FORMED;
+    case Decode::Truncated:
+      return NLSHOST_E_TRUNCATED;
+    case Decode::Ok:
+      break;
+  }
+  return 0;
 }
 
 }  // namespace nlssm::refhost::utfe

@@ -18,5 +18,8 @@ enum class Decode { Ok, IllFormed, Truncated };
 // Surrogate code points and over-long forms are ill-formed.
 Decode decode(const std::uint8_t *text, std::size_t length, std::uint32_t &character,
               std::size_t &used);
+// The same, answering with the host status of a failed decode (0 when it reads).
+std::int64_t decode_status(const std::uint8_t *text, std::size_t length, std::uint32_t &character,
+                           std::size_t &used);
 
 }  // namespace nlssm::refhost::utfe

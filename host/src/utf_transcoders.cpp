@@ -174,14 +174,7 @@ std::int64_t utfe_to_intermediate(void *, const void *source, std::uint64_t sour
                [](const std::uint8_t *in, std::uint64_t left, std::uint8_t *out, std::size_t &bytes,
                   std::size_t &used) -> std::int64_t {
                  std::uint32_t c = 0;
-                 switch (utfe::decode(in, left, c, used)) {
-                   case utfe::Decode::IllFormed:
-                     return NLSHOST_E_ILL_FORMED;
-                   case utfe::Decode::Truncated:
-                     return NLSHOST_E_TRUNCATED;
-                   case utfe::Decode::Ok:
-                     break;
-                 }
+                 if (std::int64_t status = utfe::decode_status(in, left, c, used)) return status;
                  bytes = write_utf16(c, out);
                  return 0;
                });
