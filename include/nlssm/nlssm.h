@@ -978,4 +978,20 @@ NLSSM_API int64_t ToUTFE(const NLSSMHandle *handle, uint32_t codePoint, uint8_t 
 NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string, int64_t count,
                               int64_t reserved, int64_t *byteCount, uint32_t *state);
 
+/* ---- Case mapping and normalization --------------------------------------- */
+
+/* ---- Equality, inequality and ordering comparison ------------------------- */
+
+/* ---- Searching, classification and LIKE ----------------------------------- */
+
+/* ---- Substring, delete, reverse and strip --------------------------------- */
+
+/* ---- Move, fill, concatenate, justify and add quotes ---------------------- */
+
+/* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
+
+/* ---- Number parsing and formatting ---------------------------------------- */
+
+/* ---- Bidirectional text --------------------------------------------------- */
+
 #endif /* NLSSM_NLSSM_H */
