@@ -913,11 +913,14 @@ NLSSM_API int64_t ConvertToUTF32(const void *source, int64_t sourceBytes, void *
                                  NLSUTFEncoder encoder);
 /* Encodes sourceBytes / 4 units of `source` (read with `decoder`, whose
  * status is ignored) with `encoder` until the capacity is used up. Note the
- * argument order: encoder first. Returns the encoder's failing status, else 0;
- * `written` = total bytes written. A character that an encoder would write
- * without a capacity check past the end of the destination is not written and
- * stops the loop with NLSSM_E_DEST_TOO_SMALL. Reads no byte past sourceBytes
- * rounded down to whole units. */
+ * argument order: encoder first. Every step hands the encoder the destination
+ * itself at the running offset, with the capacity that remains. Returns the
+ * encoder's failing status, else 0; `written` = total bytes written. When less
+ * room remains than one of the module's encoders writes without a capacity
+ * check (UTF32_UTF8 and UTF16_UTF8: 1 byte, the UTF-16 encoders: 2), the loop
+ * stops with NLSSM_E_DEST_TOO_SMALL before calling it; any other encoder is
+ * trusted to keep within the capacity it is given. Reads no byte past
+ * sourceBytes rounded down to whole units. */
 NLSSM_API int64_t ConvertFromUTF32(const void *source, int64_t sourceBytes, void *destination,
                                    int64_t capacity, int64_t *written, NLSUTFEncoder encoder,
                                    NLSUTFDecoder decoder);
