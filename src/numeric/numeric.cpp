@@ -271,6 +271,7 @@ void integer_field(const NLSSMHandle *handle, void *locale, int64_t value, int64
     return;
   }
   if (flags != 0 && value != 0) {
+    width = std::max<int64_t>(width, 0);  // the locale's "as wide as the number"
     locale = locale_or_handles(handle, locale);
     int32_t count = 0;
     field.status = static_cast<uint32_t>(

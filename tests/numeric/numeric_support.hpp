@@ -34,33 +34,15 @@ inline int64_t unit_bytes(const NLSSMHandle *h) {
   return h->encodingClass == NLSSM_CLASS_WCS2 || h->encodingClass == NLSSM_CLASS_WCS4 ? 4 : 1;
 }
 
+// EBCDIC (code page 037) for the characters the tests write.
 inline uint8_t ebcdic(char c) {
-  if (c >= '0' && c <= '9') return static_cast<uint8_t>(0xF0 + (c - '0'));
-  if (c >= 'a' && c <= 'i') return static_cast<uint8_t>(0x81 + (c - 'a'));
-  if (c >= 'j' && c <= 'r') return static_cast<uint8_t>(0x91 + (c - 'j'));
-  if (c >= 's' && c <= 'z') return static_cast<uint8_t>(0xA2 + (c - 's'));
-  switch (c) {
-    case ' ':
-      return 0x40;
-    case '-':
-      return 0x60;
-    case '+':
-      return 0x4E;
-    case '.':
-      return 0x4B;
-    case ',':
-      return 0x6B;
-    case '*':
-      return 0x5C;
-    case 'E':
-      return 0xC5;
-    case '\'':
-      return 0x7D;
-    case '?':
-      return 0x6F;
-    default:
-      return 0x00;
-  }
+  static const std::string kAscii = "0123456789abcdefghijklmnopqrstuvwxyz -+.,*E'?";
+  static const uint8_t kEbcdic[] = {
+      0xF0, 0xF1, 0xF2, 0xF3, 0xF4, 0xF5, 0xF6, 0xF7, 0xF8, 0xF9, 0x81, 0x82, 0x83, 0x84, 0x85,
+      0x86, 0x87, 0x88, 0x89, 0x91, 0x92, 0x93, 0x94, 0x95, 0x96, 0x97, 0x98, 0x99, 0xA2, 0xA3,
+      0xA4, 0xA5, 0xA6, 0xA7, 0xA8, 0xA9, 0x40, 0x60, 0x4E, 0x4B, 0x6B, 0x5C, 0xC5, 0x7D, 0x6F};
+  const size_t at = kAscii.find(c);
+  return at == std::string::npos ? 0 : kEbcdic[at];  // NUL stays NUL
 }
 
 // A number text (ASCII characters) in the handle's number form: bytes for

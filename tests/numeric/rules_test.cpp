@@ -72,27 +72,28 @@ TEST_P(EveryEncoding, IntegerReaderRules) {
 TEST_P(EveryEncoding, LimitsComeBeforeAnythingIsRead) {
   const std::string longText(153, '1');
   int64_t value = 0;
-  int32_t consumed = 0;
+  int32_t n = -1;
   double real = 0;
+  char out[160];
   auto toInt = reinterpret_cast<ToIntmax>(h->NLSStringToIntmax);
   auto toDouble = reinterpret_cast<ToDouble>(h->NLSStringToDouble);
   auto fromInt = reinterpret_cast<FromIntmax>(h->NLSStringFromIntmax);
   auto fromDouble = reinterpret_cast<FromDouble>(h->NLSStringFromDouble);
-  for (const void *text : {static_cast<const void *>(longText.data()), (const void *)nullptr}) {
-    EXPECT_EQ(toInt(h, nullptr, text, 153, 0, &value, &consumed), NLSSM_E_NUMBER_TOO_LONG);
-    EXPECT_EQ(toDouble(h, nullptr, text, 153, 0, 0, &real, &consumed), NLSSM_E_NUMBER_TOO_LONG);
+  for (const char *text : {longText.data(), static_cast<const char *>(nullptr)}) {
+    const uint32_t tooLong = NLSSM_E_NUMBER_TOO_LONG, null = NLSSM_E_NULL_ARGUMENT;
+    EXPECT_EQ(toInt(h, nullptr, text, 153, 0, &value, &n), tooLong);
+    EXPECT_EQ(toDouble(h, nullptr, text, 153, 0, 0, &real, &n), tooLong);
+    EXPECT_EQ(toInt(h, nullptr, text, 152, 0, &value, text ? nullptr : &n), null);
+    EXPECT_EQ(toDouble(h, nullptr, text, 152, 0, 0, &real, text ? nullptr : &n), null);
+    for (int64_t capacity : {int64_t{153}, int64_t{-1}}) {
+      EXPECT_EQ(fromInt(h, nullptr, 1, 1, 0, out, capacity, &n), tooLong);
+      EXPECT_EQ(fromDouble(h, nullptr, 1, 1, 0, 0, out, capacity, &n), tooLong);
+    }
+    EXPECT_EQ(fromInt(h, nullptr, 1, 1, 0, text ? nullptr : out, 8, text ? &n : nullptr), null);
+    EXPECT_EQ(fromDouble(h, nullptr, 1, 1, 0, 0, text ? nullptr : out, 8, text ? &n : nullptr),
+              null);
   }
-  EXPECT_EQ(toInt(h, nullptr, nullptr, 4, 0, &value, &consumed), NLSSM_E_NULL_ARGUMENT);
-  EXPECT_EQ(toDouble(h, nullptr, nullptr, 4, 0, 0, &real, &consumed), NLSSM_E_NULL_ARGUMENT);
-  char out[160];
-  int32_t written = -1;
-  for (int64_t capacity : {int64_t{153}, int64_t{-1}}) {
-    EXPECT_EQ(fromInt(h, nullptr, 1, 1, 0, out, capacity, &written), NLSSM_E_NUMBER_TOO_LONG);
-    EXPECT_EQ(fromDouble(h, nullptr, 1, 1, 0, 0, out, capacity, &written), NLSSM_E_NUMBER_TOO_LONG);
-  }
-  EXPECT_EQ(fromInt(h, nullptr, 1, 1, 0, nullptr, 8, &written), NLSSM_E_NULL_ARGUMENT);
-  EXPECT_EQ(fromDouble(h, nullptr, 1, 1, 0, 0, nullptr, 8, &written), NLSSM_E_NULL_ARGUMENT);
-  EXPECT_EQ(written, -1);
+  EXPECT_EQ(n, -1) << "nothing written";
 }
 
 struct FormatCase {
