@@ -10,6 +10,7 @@
 #include <nlssm/nlssm.h>
 
 #include <algorithm>
+#include <array>
 #include <cstdint>
 #include <cstring>
 
@@ -237,14 +238,33 @@ struct Field {
 // blanks on the left, the minus sign directly left of the leading digit; a
 // field of '*' when the number does not fit. A width of 0 or less asks for
 // the number's own width.
+constexpr auto kDigitPairs = [] {
+  std::array<char, 200> pairs{};
+  for (int i = 0; i < 100; ++i) {
+    pairs[2 * i] = static_cast<char>('0' + i / 10);
+    pairs[2 * i + 1] = static_cast<char>('0' + i % 10);
+  }
+  return pairs;
+}();
+
 void own_integer_field(int64_t value, int64_t width, int64_t capacity, Field &field) {
-  char digits[20];
-  int64_t n = 0;
+  // The digits, two at a time from the right.
+  char buffer[20];
+  char *const end = buffer + sizeof buffer;
+  char *first = end;
   uint64_t magnitude = value < 0 ? 0 - static_cast<uint64_t>(value) : static_cast<uint64_t>(value);
-  do {
-    digits[n++] = static_cast<char>('0' + magnitude % 10);
-    magnitude /= 10;
-  } while (magnitude != 0);
+  while (magnitude >= 100) {
+    first -= 2;
+    std::memcpy(first, &kDigitPairs[2 * (magnitude % 100)], 2);
+    magnitude /= 100;
+  }
+  if (magnitude >= 10) {
+    first -= 2;
+    std::memcpy(first, &kDigitPairs[2 * magnitude], 2);
+  } else {
+    *--first = static_cast<char>('0' + magnitude);
+  }
+  const int64_t n = end - first;
   const int64_t needed = n + (value < 0 ? 1 : 0);
   if (width <= 0) width = std::min(needed, capacity);
   if (needed > width) {
@@ -255,7 +275,7 @@ void own_integer_field(int64_t value, int64_t width, int64_t capacity, Field &fi
   std::fill_n(field.chars, width - needed, uint32_t{' '});
   uint32_t *p = field.chars + (width - needed);
   if (value < 0) *p++ = '-';
-  while (n > 0) *p++ = static_cast<uint32_t>(digits[--n]);
+  std::copy(first, end, p);
   field.count = width;
   field.status = 0;
 }
@@ -297,41 +317,42 @@ void double_field(const NLSSMHandle *handle, void *locale, double value, int64_t
 
 enum class Family { kAscii, kEbcdic };
 
-// One byte for a host character of a formatted number, or -1 for the
-// no-break space (written with the encoding's substitute).
-int narrow_char(uint32_t c, Family family, bool keepExponent, uint8_t apostrophe) {
-  constexpr int kNoBreakSpace = -1;
-  if (c == 0xA0) return kNoBreakSpace;
-  if (family == Family::kAscii) {
-    if ((c >= '0' && c <= '9') || c == ' ' || c == '\'' || c == '*' || c == '+' || c == ',' ||
-        c == '-' || c == '.' || (keepExponent && (c == 'E' || c == 'e')))
-      return static_cast<int>(c);
-    return '?';
-  }
-  if (c >= '0' && c <= '9') return static_cast<int>(0xF0 + (c - '0'));
-  switch (c) {
-    case ' ':
-      return 0x40;
-    case '*':
-      return 0x5C;
-    case '+':
-      return 0x4E;
-    case ',':
-      return 0x6B;
-    case '-':
-      return 0x60;
-    case '.':
-      return 0x4B;
-    case 'E':
-      return 0xC5;
-    case 'e':
-      return 0x85;
-    case '\'':
-      return apostrophe;
-    default:
-      return 0x6F;
-  }
+// Bytes for the host characters 0-255 of a formatted number: the byte
+// itself, kNoBreakSpace (the encoding's substitute) or, in EBCDIC, the
+// row's apostrophe; characters from 256 up take the table's `other` byte.
+constexpr int16_t kNoBreakSpace = -1;
+constexpr int16_t kRowApostrophe = -2;
+
+struct NarrowTable {
+  int16_t bytes[256];
+  uint8_t other;
+  uint8_t star;
+};
+
+constexpr NarrowTable make_narrow_table(Family family, bool keepExponent) {
+  const bool ascii = family == Family::kAscii;
+  NarrowTable t{};
+  t.other = ascii ? '?' : 0x6F;
+  t.star = ascii ? '*' : 0x5C;
+  for (int16_t &b : t.bytes) b = t.other;
+  for (int d = 0; d <= 9; ++d) t.bytes['0' + d] = static_cast<int16_t>(ascii ? '0' + d : 0xF0 + d);
+  const struct {
+    char c;
+    uint8_t ebcdic;
+  } kept[] = {{' ', 0x40}, {'*', 0x5C}, {'+', 0x4E}, {',', 0x6B},
+              {'-', 0x60}, {'.', 0x4B}, {'E', 0xC5}, {'e', 0x85}};
+  for (const auto &k : kept)
+    if (keepExponent || (k.c != 'E' && k.c != 'e'))
+      t.bytes[static_cast<uint8_t>(k.c)] = ascii ? k.c : k.ebcdic;
+  t.bytes['\''] = ascii ? '\'' : kRowApostrophe;
+  t.bytes[0xA0] = kNoBreakSpace;
+  return t;
 }
+
+// ASCII keeps 'E' and 'e' in doubles only; EBCDIC keeps them in both.
+constexpr NarrowTable kAsciiInteger = make_narrow_table(Family::kAscii, false);
+constexpr NarrowTable kAsciiDouble = make_narrow_table(Family::kAscii, true);
+constexpr NarrowTable kEbcdicNumber = make_narrow_table(Family::kEbcdic, true);
 
 struct Narrowed {
   int64_t bytes;
@@ -342,23 +363,24 @@ struct Narrowed {
 // member writes the first byte of the no-break-space substitute; a
 // multi-byte member copies the substitute whole, and when it does not fit
 // fills the rest of the destination with '*'.
-Narrowed narrow(const NLSSMHandle *handle, const Field &field, Family family, bool keepExponent,
+Narrowed narrow(const NLSSMHandle *handle, const Field &field, const NarrowTable &table,
                 bool wholeSubstitute, uint8_t *out, int64_t capacity) {
   const catalogue::NumSpecialChars &row = NLSNumSpecialChars[handle->encodingNumber];
-  const uint8_t apostrophe = family == Family::kAscii ? uint8_t{'\''} : row.apostrophe;
-  const uint8_t star = family == Family::kAscii ? uint8_t{'*'} : uint8_t{0x5C};
   int64_t at = 0;
   for (int64_t i = 0; i < field.count && at < capacity; ++i) {
-    const int b = narrow_char(field.chars[i], family, keepExponent, apostrophe);
+    const uint32_t c = field.chars[i];
+    const int16_t b = c < 256 ? table.bytes[c] : table.other;
     if (b >= 0) {
       out[at++] = static_cast<uint8_t>(b);
+    } else if (b == kRowApostrophe) {
+      out[at++] = row.apostrophe;
     } else if (!wholeSubstitute) {
       out[at++] = row.noBreakSpace[0];
     } else if (row.noBreakSpaceLength <= capacity - at) {
       std::memcpy(out + at, row.noBreakSpace, row.noBreakSpaceLength);
       at += row.noBreakSpaceLength;
     } else {
-      std::fill(out + at, out + capacity, star);
+      std::fill(out + at, out + capacity, table.star);
       return {capacity, true};
     }
   }
@@ -375,7 +397,10 @@ struct NarrowForm {
 
 int64_t finish_narrow(const NLSSMHandle *handle, const Field &field, NarrowForm form, bool isDouble,
                       void *destination, int64_t capacity, int32_t *written) {
-  const Narrowed n = narrow(handle, field, form.family, isDouble, form.wholeSubstitute,
+  const NarrowTable &table = form.family == Family::kEbcdic ? kEbcdicNumber
+                             : isDouble                     ? kAsciiDouble
+                                                            : kAsciiInteger;
+  const Narrowed n = narrow(handle, field, table, form.wholeSubstitute,
                             static_cast<uint8_t *>(destination), capacity);
   *written = isDouble ? static_cast<uint8_t>(n.bytes) : static_cast<uint16_t>(n.bytes);
   return n.substituteCut ? NLSSM_E_DEST_TOO_SMALL : field.status;
