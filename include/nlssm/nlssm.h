@@ -994,6 +994,148 @@ NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string
 /* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
 
 /* ---- Number parsing and formatting ---------------------------------------- */
+/* Slots 29-32. Every member takes the handle, then a host locale object (null:
+ * the handle's own "en_US" locale). Texts and destinations are at most 152
+ * bytes: a longer text, or a capacity above 152 or below 0, gives
+ * NLSSM_E_NUMBER_TOO_LONG before anything is read; a null text, destination
+ * or out pointer gives NLSSM_E_NULL_ARGUMENT. Host statuses are returned
+ * unchanged.
+ *
+ * Parse integer: blanks, an optional '+' or '-', blanks, digits. Empty or
+ * all-blank text reads as 0 (status 0, all consumed); a sign without digits
+ * is NLSSM_E_NOT_A_NUMBER. After the digits a blank or NUL ends the number;
+ * any other character gives NLSSM_E_NOT_A_NUMBER with the value read so far
+ * (neither is consumed). With flag NLSSM_NUMBER_STRICT_TAIL only blanks,
+ * optionally ended by a NUL, may follow (the blanks are consumed). Overflow:
+ * NLSSM_E_INT_OVERFLOW, value 0, every digit consumed. `consumed` counts
+ * bytes: the 32-bit forms read bytes / 4 units of 4 bytes (the _swap2 form
+ * too, after reversing the bytes of each 16-bit unit; _swap4 reverses each
+ * 32-bit unit) and report units x 4; _toQVChar converts with the handle's
+ * ownFromConverter and reports characters x unitWidth. */
+#define NLSSM_NUMBER_STRICT_TAIL 0x1000u
+NLSSM_API int64_t NLSStringToIntmax_ASCII(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, uint32_t flags, int64_t *value,
+                                          int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_EBCDIC(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, uint32_t flags,
+                                           int64_t *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_QVChar(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, uint32_t flags,
+                                           int64_t *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_swap2(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, uint32_t flags, int64_t *value,
+                                          int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_swap4(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, uint32_t flags, int64_t *value,
+                                          int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_toQVChar(const NLSSMHandle *handle, void *locale,
+                                             const void *text, int64_t textBytes, uint32_t flags,
+                                             int64_t *value, int32_t *consumed);
+
+/* Parse double: the locale's parser reads the text (the UTF-8 entry for
+ * encoding 20, the ASCII entry for other ASCII-based encodings, the EBCDIC
+ * entry, or the 32-bit entry after the same unit handling as the integer
+ * parsers); options go to it unchanged (NLSHOST_PARSE_STRICT_TAIL). The fifth
+ * argument is ignored. On a non-zero status `consumed` is not written. */
+NLSSM_API int64_t NLSStringToDouble_ASCII(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, int64_t reserved, uint32_t options,
+                                          double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_EBCDIC(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, int64_t reserved,
+                                           uint32_t options, double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_QVChar(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, int64_t reserved,
+                                           uint32_t options, double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_swap2(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, int64_t reserved, uint32_t options,
+                                          double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_swap4(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, int64_t reserved, uint32_t options,
+                                          double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_toQVChar(const NLSSMHandle *handle, void *locale,
+                                             const void *text, int64_t textBytes, int64_t reserved,
+                                             uint32_t options, double *value, int32_t *consumed);
+
+/* Format integer. A width above the capacity fills the capacity with '*'
+ * (NLSSM_E_NUMBER_DOES_NOT_FIT). With flags (NLSHOST_NUMBER_*) and a value
+ * other than 0 the locale formats; otherwise the module writes the number
+ * right-aligned in `width` characters with blanks on the left, or the whole
+ * field in '*' with NLSSM_E_NUMBER_DOES_NOT_FIT when it does not fit. A width
+ * of 0 or less means the number's own width. The _ASCII and _EBCDIC forms
+ * write one byte per character (digits, blank, apostrophe, '*', '+', ',',
+ * '-', '.'; U+00A0 as the encoding's no-break-space substitute; EBCDIC
+ * writes the apostrophe as its substitute too; anything else '?' or 0x6F);
+ * the _MBCS forms copy a multi-byte substitute whole and, when it does not
+ * fit, fill the rest with '*' and give NLSSM_E_DEST_TOO_SMALL. The 32-bit
+ * forms write capacity / 4 characters as 4-byte units (_swap2 reversing the
+ * bytes of each 16-bit unit, _swap4 of each 32-bit unit) and report
+ * characters x 4; _fromQVChar converts with the handle's ownToConverter. */
+NLSSM_API int64_t NLSStringFromIntmax_ASCII_SBCS(const NLSSMHandle *handle, void *locale,
+                                                 int64_t value, int64_t width, uint32_t flags,
+                                                 void *destination, int64_t capacity,
+                                                 int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_EBCDIC_SBCS(const NLSSMHandle *handle, void *locale,
+                                                  int64_t value, int64_t width, uint32_t flags,
+                                                  void *destination, int64_t capacity,
+                                                  int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_ASCII_MBCS(const NLSSMHandle *handle, void *locale,
+                                                 int64_t value, int64_t width, uint32_t flags,
+                                                 void *destination, int64_t capacity,
+                                                 int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_EBCDIC_MBCS(const NLSSMHandle *handle, void *locale,
+                                                  int64_t value, int64_t width, uint32_t flags,
+                                                  void *destination, int64_t capacity,
+                                                  int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_QVChar(const NLSSMHandle *handle, void *locale, int64_t value,
+                                             int64_t width, uint32_t flags, void *destination,
+                                             int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_swap2(const NLSSMHandle *handle, void *locale, int64_t value,
+                                            int64_t width, uint32_t flags, void *destination,
+                                            int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_swap4(const NLSSMHandle *handle, void *locale, int64_t value,
+                                            int64_t width, uint32_t flags, void *destination,
+                                            int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_fromQVChar(const NLSSMHandle *handle, void *locale,
+                                                 int64_t value, int64_t width, uint32_t flags,
+                                                 void *destination, int64_t capacity,
+                                                 int32_t *written);
+
+/* Format double: always the locale's formatter (decimals 0-16, or
+ * NLSHOST_DECIMALS_SHORTEST), then written as the integer forms write; 'E'
+ * and 'e' are kept. The locale's status is returned even when output was
+ * written. _UTF8 has the locale write UTF-8 straight into the destination. */
+NLSSM_API int64_t NLSStringFromDouble_ASCII_SBCS(const NLSSMHandle *handle, void *locale,
+                                                 double value, int64_t width, int64_t decimals,
+                                                 uint32_t flags, void *destination,
+                                                 int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_EBCDIC_SBCS(const NLSSMHandle *handle, void *locale,
+                                                  double value, int64_t width, int64_t decimals,
+                                                  uint32_t flags, void *destination,
+                                                  int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_ASCII_MBCS(const NLSSMHandle *handle, void *locale,
+                                                 double value, int64_t width, int64_t decimals,
+                                                 uint32_t flags, void *destination,
+                                                 int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_EBCDIC_MBCS(const NLSSMHandle *handle, void *locale,
+                                                  double value, int64_t width, int64_t decimals,
+                                                  uint32_t flags, void *destination,
+                                                  int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_UTF8(const NLSSMHandle *handle, void *locale, double value,
+                                           int64_t width, int64_t decimals, uint32_t flags,
+                                           void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_QVChar(const NLSSMHandle *handle, void *locale, double value,
+                                             int64_t width, int64_t decimals, uint32_t flags,
+                                             void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_swap2(const NLSSMHandle *handle, void *locale, double value,
+                                            int64_t width, int64_t decimals, uint32_t flags,
+                                            void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_swap4(const NLSSMHandle *handle, void *locale, double value,
+                                            int64_t width, int64_t decimals, uint32_t flags,
+                                            void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_fromQVChar(const NLSSMHandle *handle, void *locale,
+                                                 double value, int64_t width, int64_t decimals,
+                                                 uint32_t flags, void *destination,
+                                                 int64_t capacity, int32_t *written);
 
 /* ---- Bidirectional text --------------------------------------------------- */
 
