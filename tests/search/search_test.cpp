@@ -107,6 +107,30 @@ TEST_P(Search, VerifyFindsTheFirstCharacterOutsideTheSet) {
   }
 }
 
+// Long random texts (so the vector scans and the skip over well-formed
+// text run) against positions found on the code points themselves.
+TEST_P(Search, RandomTextsAgreeWithSearchingTheCodePoints) {
+  const std::u32string letters =
+      wide() ? U"ab\u65E5\u672C" : (GetParam() == 78 ? U"ab\u00E9" : U"ab\u00E9\u00FF");
+  std::mt19937 rng(GetParam());
+  auto pick = [&](int low, int high) {
+    std::u32string s(std::uniform_int_distribution<int>(low, high)(rng), U' ');
+    for (char32_t &c : s) c = letters[rng() % letters.size()];
+    return s;
+  };
+  for (int round = 0; round < 300; ++round) {
+    const std::u32string text = pick(0, 300), pattern = pick(1, 8);
+    const size_t want = text.find(pattern);
+    ASSERT_EQ(index(text, pattern), want == std::u32string::npos ? -1 : int64_t(want))
+        << "round " << round;
+    const size_t outside = text.find_first_not_of(pattern);
+    Bytes sb = encode(GetParam(), text), setb = encode(GetParam(), pattern);
+    NLSString sd = at(h, sb), setd = at(h, setb);
+    ASSERT_EQ(call(h->NLSStringVerify, h, &sd, int64_t{0}, &setd, int64_t{0}),
+              outside == std::u32string::npos ? -1 : int64_t(outside));
+  }
+}
+
 INSTANTIATE_TEST_SUITE_P(Classes, Search, ::testing::ValuesIn(kEncodings));
 
 // Bytes that match inside a character are never a match.
