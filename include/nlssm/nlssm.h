@@ -1107,8 +1107,9 @@ NLSSM_API int64_t NLSStringContains(const NLSSMHandle *handle, const uint8_t *st
  * handle's charConverter when it has one (single-byte sets: only EBCDIC-
  * based ones); a failed conversion gives -1. On a match the descriptor moves
  * to the character found (single-byte sets: charIndex and curOffset become
- * its byte offset; the other classes position it through stringSetPos); a
- * miss leaves it as it was. */
+ * its byte offset; UTF-EBCDIC sets charIndex, curOffset, prevOffset and
+ * nextOffset by its own sequences; the other classes position it through
+ * stringSetPos); a miss leaves it as it was. */
 NLSSM_API int64_t NLSStringFindCharLit_SBCS(const NLSSMHandle *handle, NLSString *string,
                                             int64_t count, const uint8_t *literal);
 NLSSM_API int64_t NLSStringFindCharLit_UTF8(const NLSSMHandle *handle, NLSString *string,

@@ -216,7 +216,20 @@ int64_t find_char_plain(const NLSSMHandle *h, NLSString *s, int64_t count, const
   const M m(h);
   ts.n = span_of(m, ts.p, ts.n, count, ts.state);
   const int64_t r = find_char(h, m, ts, literal, true);
-  if (r >= 0 && h->stringSetPos != nullptr) {
+  if (r < 0) return r;
+  if constexpr (std::is_same_v<M, UtfeModel>) {
+    // The class's cursor steps UTF-EBCDIC by UTF-8 lead bytes and would
+    // land elsewhere: the descriptor is placed on the character found.
+    Walk<M> w(m, ts.p, static_cast<int64_t>(s->length) - s->curOffset);
+    int64_t prev = NLSSM_POS_NO_PREVIOUS;
+    for (int64_t i = 0; i < r; ++i, w.next()) prev = s->curOffset + w.offset();
+    const Char c = w.current();
+    w.next();
+    if (r > 0) s->prevOffset = prev;
+    s->nextOffset = w.done() ? NLSSM_POS_NONE : s->curOffset + w.offset();
+    s->charIndex += r;
+    s->curOffset += c.offset;
+  } else if (h->stringSetPos != nullptr) {
     using SetPos = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t);
     reinterpret_cast<SetPos>(h->stringSetPos)(h, s, s->charIndex + r, 0);
   }

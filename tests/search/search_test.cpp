@@ -11,8 +11,8 @@ namespace search_test {
 namespace {
 
 // Encodings of every class: Latin-1, EBCDIC 037, UTF-8, UTF-16 BE/LE,
-// UTF-32 BE, modal 939, Shift-JIS, EUC-JP, GB18030.
-const int kEncodings[] = {29, 78, 20, 24, 25, 26, 129, 135, 134, 205};
+// UTF-32 BE, UTF-EBCDIC, modal 939, Shift-JIS, EUC-JP, GB18030.
+const int kEncodings[] = {29, 78, 20, 24, 25, 26, 161, 129, 135, 134, 205};
 
 class Search : public ::testing::TestWithParam<int> {
  protected:

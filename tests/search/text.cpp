@@ -16,6 +16,14 @@ const NLSSMHandle *handle(int encoding) {
 
 Bytes encode(int encoding, const std::u32string &text) {
   const auto *info = nlssm::refhost::ReferenceHost::registry().find(encoding);
+  if (info->converter == "builtin:utf-ebcdic") {  // ICU has none: the module's encoder
+    Bytes out;
+    for (char32_t c : text) {
+      uint8_t bytes[8];
+      out.insert(out.end(), bytes, bytes + ToUTFE(handle(encoding), c, bytes));
+    }
+    return out;
+  }
   const std::string name = info->converter.substr(0, info->converter.find(','));
   UErrorCode e = U_ZERO_ERROR;
   UConverter *cnv = ucnv_open(name.c_str(), &e);
