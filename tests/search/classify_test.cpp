@@ -97,7 +97,7 @@ TEST_P(Unicode, CategoriesComeFromTheHostQuery) {
   EXPECT_EQ(space(0x2009, 1), 1);
 }
 
-INSTANTIATE_TEST_SUITE_P(Forms, Unicode, ::testing::Values(20, 24, 25, 26));
+INSTANTIATE_TEST_SUITE_P(Forms, Unicode, ::testing::Values(20, 161, 24, 25, 26));
 
 TEST(Classify, ALoneHighSurrogateIsInNoClass) {
   for (int32_t mask : {0x01, 0x10, 0x40, 0xFF}) {
