@@ -1,0 +1,171 @@
+// Transliterate: copy a source into a destination, replacing each character
+// found in the from-list by the to-list's character at the same index (the
+// first match wins). Single-byte text maps through a 256-entry table built
+// once per call; the other classes search the from-list per character, but
+// only for characters whose first byte starts some from-list character.
+#include <nlssm/nlssm.h>
+
+#include <cstdint>
+
+#include "edit/byte_map.hpp"
+#include "edit/copy_engines.hpp"
+
+namespace nlssm::edit {
+namespace {
+
+struct TranslitArgs {
+  Span src;
+  int64_t n;  // characters; 0 or less: the whole source
+  Span to;
+  Span from;
+  int64_t pairs;  // 0 or less: the shorter list's character count
+};
+
+// Pairs in effect: never more than either list holds.
+template <class C>
+int64_t pair_count(const C &c, const TranslitArgs &a) {
+  const int64_t from = count_chars(c, a.from), to = count_chars(c, a.to);
+  const int64_t lists = from < to ? from : to;
+  return a.pairs > 0 && a.pairs < lists ? a.pairs : lists;
+}
+
+Result transliterate_bytes(const TranslitArgs &a, int64_t pairs, uint8_t *out, int64_t room) {
+  uint8_t map[256];
+  for (int b = 0; b < 256; ++b) map[b] = static_cast<uint8_t>(b);
+  for (int64_t i = pairs - 1; i >= 0; --i) map[a.from.p[i]] = a.to.p[i];  // first match wins
+  int64_t count = a.src.length;
+  if (a.n > 0 && a.n < count) count = a.n;
+  const int64_t done = count < room ? count : room;
+  map_bytes(best_map_isa(), map, a.src.p, out, done);
+  return {count > room ? kDestTooSmall : kOk, done};
+}
+
+template <class C>
+Result transliterate(const C &c, const TranslitArgs &a, uint8_t *out, int64_t room, bool dbl) {
+  const int64_t pairs = pair_count(c, a);
+  if constexpr (C::kBytes) {
+    return transliterate_bytes(a, pairs, out, room);
+  } else {
+    bool starts[256] = {};
+    Reader<C> scan(c, a.from);
+    Char ch;
+    for (int64_t i = 0; i < pairs && scan.next(ch); ++i) starts[*ch.p] = true;
+
+    Reader<C> src(c, a.src);
+    Writer<C> w(c, out, room, dbl);
+    int64_t left = a.n > 0 ? a.n : -1;
+    int64_t status = kOk;
+    while (left != 0 && src.next(ch)) {
+      Char put = ch;
+      if (starts[*ch.p]) {
+        Reader<C> from(c, a.from), to(c, a.to);
+        Char f, t;
+        for (int64_t i = 0; i < pairs && from.next(f) && to.next(t); ++i)
+          if (same(f, ch)) {
+            put = t;
+            break;
+          }
+      }
+      if (!w.put(put)) {
+        status = kDestTooSmall;
+        break;
+      }
+      if (left > 0) --left;
+    }
+    return {status, w.finish()};
+  }
+}
+
+NLSSM_COPY_ENGINES_ALL(DO_TRANSLITERATE, TranslitArgs, transliterate)
+
+int64_t transliterate_plain(const NLSSMHandle *h, const NLSString *source, int64_t n,
+                            const NLSString *toList, const NLSString *fromList, int64_t pairs,
+                            NLSString *dst, int64_t *written,
+                            DescriptorEngine<TranslitArgs> engine) {
+  store(written, 0);
+  if (!usable(source) || !usable(toList) || !usable(fromList) || !usable_dst(dst))
+    return kNullArgument;
+  const TranslitArgs a{span_of(*source), n, span_of(*toList), span_of(*fromList), pairs};
+  return run_plain(h, a, dst, written, engine);
+}
+
+int64_t transliterate_raw(const NLSSMHandle *h, const uint8_t *source, int64_t sourceLength,
+                          const uint8_t *toList, int64_t toLength, const uint8_t *fromList,
+                          int64_t fromLength, int64_t pairs, uint8_t *dst, int64_t dstLength,
+                          int64_t *written, RawEngine<TranslitArgs> engine) {
+  store(written, 0);
+  if (!usable(source, sourceLength) || !usable(toList, toLength) || !usable(fromList, fromLength) ||
+      !usable(dst, dstLength))
+    return kNullArgument;
+  const TranslitArgs a{span_of(source, sourceLength), 0, span_of(toList, toLength),
+                       span_of(fromList, fromLength), pairs};
+  return run_raw(h, a, dst, dstLength, written, engine);
+}
+
+}  // namespace
+}  // namespace nlssm::edit
+
+using namespace nlssm::edit;
+
+#define NLSSM_TRANSLITERATE_MEMBERS(suffix)                                                     \
+  extern "C" int64_t NLSStringTransliterate_##suffix(                                           \
+      const NLSSMHandle *h, const NLSString *source, int64_t n, const NLSString *toList,        \
+      const NLSString *fromList, int64_t pairCount, NLSString *destination, int64_t *written,   \
+      int64_t) {                                                                                \
+    return transliterate_plain(h, source, n, toList, fromList, pairCount, destination, written, \
+                               &DO_TRANSLITERATE_##suffix);                                     \
+  }                                                                                             \
+  extern "C" int64_t NLSStringTransliterateS_##suffix(                                          \
+      const NLSSMHandle *h, const uint8_t *source, int64_t sourceLength, const uint8_t *toList, \
+      int64_t toLength, const uint8_t *fromList, int64_t fromLength, int64_t pairCount,         \
+      uint8_t *destination, int64_t destinationLength, int64_t *written, int64_t) {             \
+    return transliterate_raw(h, source, sourceLength, toList, toLength, fromList, fromLength,   \
+                             pairCount, destination, destinationLength, written,                \
+                             &DO_TRANSLITERATE_##suffix##S);                                    \
+  }
+
+NLSSM_TRANSLITERATE_MEMBERS(SBCS)
+NLSSM_TRANSLITERATE_MEMBERS(UTF8)
+NLSSM_TRANSLITERATE_MEMBERS(WCS2)
+NLSSM_TRANSLITERATE_MEMBERS(WCS4)
+NLSSM_TRANSLITERATE_MEMBERS(DBCS)
+NLSSM_TRANSLITERATE_MEMBERS(DBCSM)
+
+// ---- Literal lists -----------------------------------------------------------
+
+using TranslitFn = int64_t (*)(const NLSSMHandle *, const NLSString *, int64_t, const NLSString *,
+                               const NLSString *, int64_t, NLSString *, int64_t *, int64_t);
+using TranslitSFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, const uint8_t *,
+                                int64_t, const uint8_t *, int64_t, int64_t, uint8_t *, int64_t,
+                                int64_t *, int64_t);
+
+extern "C" int64_t NLSStringTransliterateLit(const NLSSMHandle *h, const NLSString *source,
+                                             int64_t n, const uint8_t *toList, int64_t toLength,
+                                             const uint8_t *fromList, int64_t fromLength,
+                                             int64_t pairCount, NLSString *destination,
+                                             int64_t *written, int64_t flags) {
+  store(written, 0);
+  if (!usable(toList, toLength) || !usable(fromList, fromLength)) return kNullArgument;
+  LiteralText to, from;
+  if (const int64_t status = to.convert(h, toList, toLength); status != kOk) return status;
+  if (const int64_t status = from.convert(h, fromList, fromLength); status != kOk) return status;
+  const NLSString toText = to.descriptor(h), fromText = from.descriptor(h);
+  return reinterpret_cast<TranslitFn>(h->NLSStringTransliterate)(
+      h, source, n, &toText, &fromText, pairCount, destination, written, flags);
+}
+
+extern "C" int64_t NLSStringTransliterateLitS(const NLSSMHandle *h, const uint8_t *source,
+                                              int64_t sourceLength, const uint8_t *toList,
+                                              int64_t toLength, const uint8_t *fromList,
+                                              int64_t fromLength, int64_t pairCount,
+                                              uint8_t *destination, int64_t destinationLength,
+                                              int64_t *written, int64_t flags) {
+  store(written, 0);
+  if (!usable(toList, toLength) || !usable(fromList, fromLength)) return kNullArgument;
+  LiteralText to, from;
+  if (const int64_t status = to.convert(h, toList, toLength); status != kOk) return status;
+  if (const int64_t status = from.convert(h, fromList, fromLength); status != kOk) return status;
+  return reinterpret_cast<TranslitSFn>(h->NLSStringTransliterateS)(
+      h, source, sourceLength, to.text(), to.length(), from.text(), from.length(), pairCount,
+      destination, destinationLength, written, flags);
+}
