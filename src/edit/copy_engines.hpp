@@ -49,6 +49,8 @@ struct NoShifts {
 
 struct SbcsChars : NoShifts {
   static constexpr bool kBytes = true;
+  static constexpr bool kSelfSync = true;
+  static bool starts_char(uint8_t) { return true; }
   Char at(const uint8_t *p, int64_t, uint32_t) const { return {p, 1}; }
 };
 
@@ -58,6 +60,10 @@ struct SbcsChars : NoShifts {
 template <bool kUtfe>
 struct UtfChars : NoShifts {
   static constexpr bool kBytes = false;
+  static constexpr bool kSelfSync = true;  // every non-trailing byte starts a character
+  static bool starts_char(uint8_t b) {
+    return !(kUtfe ? cursor::utfe_trailing(b) : cursor::utf8_continuation(b));
+  }
   Char at(const uint8_t *p, int64_t remaining, uint32_t) const {
     const uint8_t b = *p;
     const bool trailing = kUtfe ? cursor::utfe_trailing(b) : cursor::utf8_continuation(b);
@@ -75,6 +81,7 @@ struct UtfChars : NoShifts {
 template <bool kBig>
 struct Wcs2Chars : NoShifts {
   static constexpr bool kBytes = false;
+  static constexpr bool kSelfSync = false;
   static int64_t usable(int64_t length) { return length & ~int64_t{1}; }
   Char at(const uint8_t *p, int64_t remaining, uint32_t) const {
     return {p, cursor::Wcs2Model<kBig>().step(p, remaining, 0)};
@@ -84,6 +91,7 @@ struct Wcs2Chars : NoShifts {
 // Four-byte units, compared as four bytes in memory order.
 struct Wcs4Chars : NoShifts {
   static constexpr bool kBytes = false;
+  static constexpr bool kSelfSync = false;
   static int64_t usable(int64_t length) { return length & ~int64_t{3}; }
   Char at(const uint8_t *p, int64_t, uint32_t) const { return {p, 4}; }
 };
@@ -93,6 +101,7 @@ struct Wcs4Chars : NoShifts {
 template <class Model>
 struct NonModalChars : NoShifts {
   static constexpr bool kBytes = false;
+  static constexpr bool kSelfSync = false;
   Model model;
   explicit NonModalChars(const NLSSMHandle *h) : model(h) {}
   Char at(const uint8_t *p, int64_t remaining, uint32_t) const {
@@ -104,6 +113,7 @@ struct NonModalChars : NoShifts {
 struct ModalChars {
   static constexpr bool kModal = true;
   static constexpr bool kBytes = false;
+  static constexpr bool kSelfSync = false;
   cursor::ModalModel model;
   explicit ModalChars(const NLSSMHandle *h) : model(h) {}
   static int64_t usable(int64_t length) { return length; }

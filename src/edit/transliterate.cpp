@@ -40,39 +40,60 @@ Result transliterate_bytes(const TranslitArgs &a, int64_t pairs, uint8_t *out, i
   return {count > room ? kDestTooSmall : kOk, done};
 }
 
+// The pairs in effect, the first kCached of them read once into arrays, the
+// rest read from the lists when a character gets that far.
+template <class C>
+class Pairs {
+ public:
+  static constexpr int64_t kCached = 64;
+
+  Pairs(const C &c, const TranslitArgs &a, int64_t count) : c_(&c), a_(&a), count_(count) {
+    Reader<C> from(c, a.from), to(c, a.to);
+    while (cached_ < count && cached_ < kCached && from.next(from_[cached_]) &&
+           to.next(to_[cached_]))
+      starts_[*from_[cached_++].p] = true;
+    for (Char f; cached_ + seen_ < count && from.next(f); ++seen_) starts_[*f.p] = true;
+  }
+
+  // The to-character of the first from-character equal to ch, or ch.
+  Char map(const Char &ch) const {
+    if (!starts_[*ch.p]) return ch;
+    for (int64_t i = 0; i < cached_; ++i)
+      if (same(from_[i], ch)) return to_[i];
+    if (seen_ == 0) return ch;
+    Reader<C> from(*c_, a_->from), to(*c_, a_->to);
+    Char f, t;
+    for (int64_t i = 0; i < count_ && from.next(f) && to.next(t); ++i)
+      if (i >= cached_ && same(f, ch)) return t;
+    return ch;
+  }
+
+ private:
+  const C *c_;
+  const TranslitArgs *a_;
+  int64_t count_;
+  int64_t cached_ = 0;
+  int64_t seen_ = 0;  // pairs beyond the cached ones
+  bool starts_[256] = {};
+  Char from_[kCached], to_[kCached];
+};
+
 template <class C>
 Result transliterate(const C &c, const TranslitArgs &a, uint8_t *out, int64_t room, bool dbl) {
   const int64_t pairs = pair_count(c, a);
   if constexpr (C::kBytes) {
     return transliterate_bytes(a, pairs, out, room);
   } else {
-    bool starts[256] = {};
-    Reader<C> scan(c, a.from);
-    Char ch;
-    for (int64_t i = 0; i < pairs && scan.next(ch); ++i) starts[*ch.p] = true;
-
+    const Pairs<C> table(c, a, pairs);
     Reader<C> src(c, a.src);
     Writer<C> w(c, out, room, dbl);
     int64_t left = a.n > 0 ? a.n : -1;
-    int64_t status = kOk;
+    Char ch;
     while (left != 0 && src.next(ch)) {
-      Char put = ch;
-      if (starts[*ch.p]) {
-        Reader<C> from(c, a.from), to(c, a.to);
-        Char f, t;
-        for (int64_t i = 0; i < pairs && from.next(f) && to.next(t); ++i)
-          if (same(f, ch)) {
-            put = t;
-            break;
-          }
-      }
-      if (!w.put(put)) {
-        status = kDestTooSmall;
-        break;
-      }
+      if (!w.put(table.map(ch))) return {kDestTooSmall, w.finish()};
       if (left > 0) --left;
     }
-    return {status, w.finish()};
+    return {kOk, w.finish()};
   }
 }
 

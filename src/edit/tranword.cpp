@@ -18,51 +18,10 @@ struct TranwordArgs {
   Span replacement;
   Span find;
   int64_t findCount;  // count-down per replacement; less than 0: the find word's characters
+  bool nIsCount;      // n is the source's character count
 };
 
 constexpr int64_t kNoLimit = INT64_MAX;
-
-// Single-byte text: the find word's first byte is looked for with memchr and
-// the text between matches is copied in blocks.
-Result tranword_bytes(const TranwordArgs &a, int64_t findCount, uint8_t *out, int64_t room) {
-  const uint8_t *s = a.src.p, *f = a.find.p, *r = a.replacement.p;
-  const int64_t length = a.src.length, fl = a.find.length, rl = a.replacement.length;
-  int64_t i = 0, used = 0, left = a.n < 0 ? kNoLimit : a.n;
-  while (left > 0 && i < length) {
-    const int64_t limit = left < length - i ? i + left : length;
-    int64_t hit = limit;
-    for (const uint8_t *p = s + i; fl != 0 && p < s + limit; ++p) {
-      p = static_cast<const uint8_t *>(std::memchr(p, f[0], static_cast<size_t>(s + limit - p)));
-      if (p == nullptr) break;
-      if (fl <= s + length - p && std::memcmp(p, f, static_cast<size_t>(fl)) == 0) {
-        hit = p - s;
-        break;
-      }
-    }
-    const int64_t copy = hit - i;
-    if (copy > room - used) {
-      std::memcpy(out + used, s + i, static_cast<size_t>(room - used));
-      return {kDestTooSmall, room};
-    }
-    std::memcpy(out + used, s + i, static_cast<size_t>(copy));
-    used += copy;
-    left -= copy;
-    i = hit;
-    if (hit == limit) continue;
-    if (rl > room - used) {  // copy on as far as the source fits
-      int64_t rest = room - used;
-      if (rest > length - i) rest = length - i;
-      if (rest > left) rest = left;
-      std::memcpy(out + used, s + i, static_cast<size_t>(rest));
-      return {kDestTooSmall, used + rest};
-    }
-    if (rl != 0) std::memcpy(out + used, r, static_cast<size_t>(rl));
-    used += rl;
-    i += fl;
-    left = left > findCount ? left - findCount : 0;
-  }
-  return {kOk, used};
-}
 
 // Whether the find word continues at `after` (its first character matched
 // just before it); on a match `after` moves behind the word.
@@ -77,36 +36,122 @@ bool rest_matches(const C &c, const Span &find, Reader<C> &after) {
   return true;
 }
 
+// A match at `at`, the source behind it: writes the replacement and counts
+// n down, or, when the replacement does not fit, copies the source on from
+// the match as far as it fits and answers false.
+template <class C>
+bool replace(const C &c, const TranwordArgs &a, int64_t findCount, Reader<C> &src,
+             const Reader<C> &at, Writer<C> &w, int64_t &left) {
+  Char ch;
+  const bool fits = C::kModal ? w.fits_all(a.replacement) : a.replacement.length <= w.left();
+  if (!fits) {
+    src = at;
+    while (left > 0 && src.next(ch) && w.put(ch)) --left;
+    return false;
+  }
+  if constexpr (C::kModal) {
+    for (Reader<C> word(c, a.replacement); word.next(ch);) w.put(ch);
+  } else {
+    w.put_bytes(a.replacement.p, a.replacement.length);
+  }
+  left = left > findCount ? left - findCount : 0;
+  return true;
+}
+
+// Character by character, for every class.
+template <class C>
+int64_t tranword_walk(const C &c, const TranwordArgs &a, int64_t findCount, Writer<C> &w) {
+  const Char first = first_char(c, a.find);
+  Reader<C> src(c, a.src);
+  int64_t left = a.n < 0 ? kNoLimit : a.n;
+  Char ch;
+  while (left > 0) {
+    const Reader<C> at = src;
+    if (!src.next(ch)) break;
+    if (first.size != 0 && same(ch, first) && rest_matches(c, a.find, src)) {
+      if (!replace(c, a, findCount, src, at, w, left)) return kDestTooSmall;
+      continue;
+    }
+    if (!w.put(ch)) return kDestTooSmall;
+    --left;
+  }
+  return kOk;
+}
+
+// Classes in which every byte the find word can start with starts a
+// character (single-byte, and UTF text when the word starts with a lead
+// byte): candidates are found with memchr and memcmp, and the text between
+// matches is copied in blocks. In single-byte text n counts the bytes; UTF
+// text comes here only when n cannot run out.
+template <class C>
+int64_t tranword_scan(const C &c, const TranwordArgs &a, int64_t findCount, Writer<C> &w) {
+  struct {
+    int64_t offset = 0, size = 0;
+  } last;  // the find word's last character
+  Char ch;
+  for (Reader<C> word(c, a.find); word.next(ch);) last = {ch.p - a.find.p, ch.size};
+  Reader<C> src(c, a.src);
+  const uint8_t *p = src.p;
+  const int64_t end = src.end, fl = a.find.length;
+  int64_t left = a.n < 0 ? kNoLimit : a.n;
+  int64_t start = 0, pos = 0;  // the text not yet copied begins at start
+  // Copies the text from start to `to`, or as many whole characters of it
+  // as the room takes.
+  auto flush = [&](int64_t to) {
+    if (to - start > w.left()) {
+      src.off = start;
+      while (src.next(ch) && w.put(ch)) {
+      }
+      return false;
+    }
+    w.put_bytes(p + start, to - start);
+    if constexpr (C::kBytes) left -= to - start;
+    start = to;
+    return true;
+  };
+  while (left > 0 && start < end) {
+    const int64_t stop = C::kBytes && left < end - start ? start + left : end;
+    const auto *hit = fl == 0 || pos >= stop
+                          ? nullptr
+                          : static_cast<const uint8_t *>(
+                                std::memchr(p + pos, *a.find.p, static_cast<size_t>(stop - pos)));
+    if (hit == nullptr) {
+      if (!flush(stop)) return kDestTooSmall;
+      break;
+    }
+    const int64_t h = hit - p;
+    pos = h + 1;
+    if (end - h < fl || std::memcmp(hit, a.find.p, static_cast<size_t>(fl)) != 0) continue;
+    // Equal bytes are equal characters, unless the word's last character is
+    // cut short where the text's goes on.
+    if (c.at(hit + last.offset, end - h - last.offset, 0).size != last.size) continue;
+    src.off = h;
+    const Reader<C> at = src;
+    src.off = h + fl;
+    if (!flush(h)) return kDestTooSmall;
+    if (!replace(c, a, findCount, src, at, w, left)) return kDestTooSmall;
+    start = pos = src.off;
+  }
+  return kOk;
+}
+
 template <class C>
 Result tranword(const C &c, const TranwordArgs &a, uint8_t *out, int64_t room, bool dbl) {
-  const int64_t findCount = a.findCount < 0 ? count_chars(c, a.find) : a.findCount;
-  if constexpr (C::kBytes) {
-    return tranword_bytes(a, findCount, out, room);
+  const int64_t findChars = count_chars(c, a.find);
+  const int64_t findCount = a.findCount < 0 ? findChars : a.findCount;
+  Writer<C> w(c, out, room, dbl);
+  int64_t status;
+  if constexpr (C::kSelfSync) {
+    // n cannot run out when it covers the source and no replacement counts
+    // it down by more than the characters it consumes.
+    const bool unlimited =
+        a.n < 0 || ((a.nIsCount || a.n >= a.src.length) && findCount <= findChars);
+    const bool scan = (C::kBytes || unlimited) && (a.find.length == 0 || C::starts_char(*a.find.p));
+    status = scan ? tranword_scan(c, a, findCount, w) : tranword_walk(c, a, findCount, w);
   } else {
-    const Char first = first_char(c, a.find);
-    Reader<C> src(c, a.src);
-    Writer<C> w(c, out, room, dbl);
-    int64_t left = a.n < 0 ? kNoLimit : a.n;
-    Char ch;
-    while (left > 0) {
-      const Reader<C> at = src;
-      if (!src.next(ch)) break;
-      if (first.size != 0 && same(ch, first) && rest_matches(c, a.find, src)) {
-        if (!w.fits_all(a.replacement)) {  // copy on as far as the source fits
-          src = at;
-          while (left > 0 && src.next(ch) && w.put(ch)) --left;
-          return {kDestTooSmall, w.finish()};
-        }
-        Reader<C> word(c, a.replacement);
-        while (word.next(ch)) w.put(ch);
-        left = left > findCount ? left - findCount : 0;
-        continue;
-      }
-      if (!w.put(ch)) return {kDestTooSmall, w.finish()};
-      --left;
-    }
-    return {kOk, w.finish()};
+    status = tranword_walk(c, a, findCount, w);
   }
+  return {status, w.finish()};
 }
 
 NLSSM_COPY_ENGINES_ALL(DO_Tranword, TranwordArgs, tranword)
@@ -125,13 +170,15 @@ int64_t tranword_plain(const NLSSMHandle *h, const NLSString *source, int64_t n,
   store(written, 0);
   if (!usable(source) || !usable(replacement) || !usable(find) || !usable_dst(dst))
     return kNullArgument;
-  if (n <= 0 || replacementLength <= 0 || findLength <= 0) {
+  const bool whole = n <= 0;
+  if (whole || replacementLength <= 0 || findLength <= 0) {
     int64_t count = 0;
     reinterpret_cast<NumCharsFn>(h->NLSNumChars)(h, source, 0, &count);
-    if (n <= 0) n = count;
+    if (whole) n = count;
     if (findLength <= 0) findLength = count;
   }
-  const TranwordArgs a{span_of(*source), n, span_of(*replacement), span_of(*find), findLength};
+  const TranwordArgs a{span_of(*source), n,          span_of(*replacement),
+                       span_of(*find),   findLength, whole};
   return run_plain(h, a, dst, written, engine);
 }
 
@@ -144,7 +191,7 @@ int64_t tranword_raw(const NLSSMHandle *h, const uint8_t *source, int64_t source
       !usable(find, findLength) || !usable(dst, dstLength))
     return kNullArgument;
   const TranwordArgs a{span_of(source, sourceLength), -1, span_of(replacement, replacementLength),
-                       span_of(find, findLength), -1};
+                       span_of(find, findLength),     -1, false};
   return run_raw(h, a, dst, dstLength, written, engine);
 }
 
