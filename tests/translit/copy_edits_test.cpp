@@ -9,7 +9,9 @@
 #include <nlssm/reference_host.hpp>
 
 #include <cstring>
+#include <random>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace {
@@ -416,3 +418,43 @@ TEST(CopyEditArguments, MissingTextIsANullArgument) {
 }
 
 }  // namespace
+
+// UTF text, broken sequences included, through both tranword paths: the
+// block scan (no limit) and the character walk (an explicit n).
+TEST(CopyEditTranword, ScanAndWalkAgreeOnAnyBytes) {
+  std::mt19937 rng(15);
+  for (int encoding : {20, kUtfe}) {
+    const NLSSMHandle *h = handle(encoding);
+    const Bytes alphabet = encoding == 20 ? Bytes("ab\xC3\xA9\xE6\x97\xA5\x80\xF0")
+                                          : Bytes("\x81\x82\xB8\x41\x73\xDC\x68\x56\x46\xFF");
+    auto random = [&](size_t n) {
+      Bytes s;
+      while (s.size() < n) s += alphabet[rng() % alphabet.size()];
+      return s;
+    };
+    for (int round = 0; round < 2000; ++round) {
+      const Bytes src = random(rng() % 24), find = random(1 + rng() % 3), repl = random(rng() % 3);
+      NLSString sd{}, fd{}, rd{};
+      for (auto [d, b] : {std::pair{&sd, &src}, {&fd, &find}, {&rd, &repl}}) {
+        d->buffer = const_cast<uint8_t *>(u(*b));
+        d->length = d->capacity = b->size();
+        d->curOffset = b->empty() ? NLSSM_POS_NONE : 0;
+      }
+      int64_t chars = 0, find_chars = 0;
+      reinterpret_cast<decltype(&NLSNumCharsS_UTF8)>(h->NLSNumCharsS)(h, u(find), len(find), 0,
+                                                                      &find_chars);
+      reinterpret_cast<decltype(&NLSNumCharsS_UTF8)>(h->NLSNumCharsS)(h, u(src), len(src), 0,
+                                                                      &chars);
+      Dest walk(64);
+      uint8_t scan[64];
+      int64_t wn = 0, sn = 0;
+      const int64_t ws =
+          NLSStringTranword_UTF8(h, &sd, chars + 1, &rd, 1, &fd, find_chars, &walk.d, &wn, 0);
+      const int64_t ss = NLSStringTranwordS_UTF8(h, u(src), len(src), u(repl), len(repl), u(find),
+                                                 len(find), scan, 64, &sn, 0);
+      ASSERT_EQ(ws, ss);
+      ASSERT_EQ(walk.text(), Bytes(reinterpret_cast<char *>(scan), static_cast<size_t>(sn)))
+          << encoding << " round " << round;
+    }
+  }
+}
