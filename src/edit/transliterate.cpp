@@ -160,17 +160,34 @@ using TranslitSFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, c
                                 int64_t, const uint8_t *, int64_t, int64_t, uint8_t *, int64_t,
                                 int64_t *, int64_t);
 
+namespace {
+
+// The two lists of a literal call in the handle's encoding.
+struct LiteralLists {
+  LiteralText to, from;
+
+  // 0, or the status the call returns at once.
+  int64_t convert(const NLSSMHandle *h, const uint8_t *toList, int64_t toLength,
+                  const uint8_t *fromList, int64_t fromLength, int64_t *written) {
+    store(written, 0);
+    if (!usable(toList, toLength) || !usable(fromList, fromLength)) return kNullArgument;
+    if (const int64_t status = to.convert(h, toList, toLength); status != kOk) return status;
+    return from.convert(h, fromList, fromLength);
+  }
+};
+
+}  // namespace
+
 extern "C" int64_t NLSStringTransliterateLit(const NLSSMHandle *h, const NLSString *source,
                                              int64_t n, const uint8_t *toList, int64_t toLength,
                                              const uint8_t *fromList, int64_t fromLength,
                                              int64_t pairCount, NLSString *destination,
                                              int64_t *written, int64_t flags) {
-  store(written, 0);
-  if (!usable(toList, toLength) || !usable(fromList, fromLength)) return kNullArgument;
-  LiteralText to, from;
-  if (const int64_t status = to.convert(h, toList, toLength); status != kOk) return status;
-  if (const int64_t status = from.convert(h, fromList, fromLength); status != kOk) return status;
-  const NLSString toText = to.descriptor(h), fromText = from.descriptor(h);
+  LiteralLists lists;
+  if (const int64_t status = lists.convert(h, toList, toLength, fromList, fromLength, written);
+      status != kOk)
+    return status;
+  const NLSString toText = lists.to.descriptor(h), fromText = lists.from.descriptor(h);
   return reinterpret_cast<TranslitFn>(h->NLSStringTransliterate)(
       h, source, n, &toText, &fromText, pairCount, destination, written, flags);
 }
@@ -181,12 +198,11 @@ extern "C" int64_t NLSStringTransliterateLitS(const NLSSMHandle *h, const uint8_
                                               int64_t fromLength, int64_t pairCount,
                                               uint8_t *destination, int64_t destinationLength,
                                               int64_t *written, int64_t flags) {
-  store(written, 0);
-  if (!usable(toList, toLength) || !usable(fromList, fromLength)) return kNullArgument;
-  LiteralText to, from;
-  if (const int64_t status = to.convert(h, toList, toLength); status != kOk) return status;
-  if (const int64_t status = from.convert(h, fromList, fromLength); status != kOk) return status;
+  LiteralLists lists;
+  if (const int64_t status = lists.convert(h, toList, toLength, fromList, fromLength, written);
+      status != kOk)
+    return status;
   return reinterpret_cast<TranslitSFn>(h->NLSStringTransliterateS)(
-      h, source, sourceLength, to.text(), to.length(), from.text(), from.length(), pairCount,
-      destination, destinationLength, written, flags);
+      h, source, sourceLength, lists.to.text(), lists.to.length(), lists.from.text(),
+      lists.from.length(), pairCount, destination, destinationLength, written, flags);
 }

@@ -309,6 +309,13 @@ TEST_P(CopyEdits, DestinationUpdateFromItsPosition) {
   EXPECT_EQ(squeeze_into(&pd), len(src));
   EXPECT_EQ(pd.nextOffset, at + 1);
   EXPECT_EQ(positioned.substr(0, pd.length), base.substr(0, static_cast<size_t>(at)) + src);
+
+  // Written over a character inside a double-byte run, the text still reads.
+  positioned = base + Bytes(16, '\0');
+  pd = over(positioned, 1);
+  pd.length = base.size();
+  squeeze_into(&pd);
+  EXPECT_EQ(dec(positioned.substr(0, pd.length)), "xab");
 }
 
 // A destination over the source's own text: the result is built in a work
