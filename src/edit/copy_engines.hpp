@@ -301,6 +301,7 @@ class Writer {
 
   // Raw bytes of a non-modal text (its characters are its bytes).
   void put_bytes(const uint8_t *p, int64_t n) {
+    if (n == 0) return;
     std::memcpy(out_ + used_, p, static_cast<size_t>(n));
     used_ += n;
   }
