@@ -19,10 +19,6 @@
 namespace nlssm::edit {
 namespace {
 
-// SSE2 compare-and-blend stays ahead of the table loop up to this many
-// changed values.
-constexpr int kSse2MaxChanges = 6;
-
 void map_scalar(const uint8_t *map, const uint8_t *in, uint8_t *out, int64_t n) {
   int64_t i = 0;
   for (; i + 4 <= n; i += 4) {
@@ -32,36 +28,20 @@ void map_scalar(const uint8_t *map, const uint8_t *in, uint8_t *out, int64_t n) 
   for (; i < n; ++i) out[i] = map[in[i]];
 }
 
-struct Changes {
-  int count = 0;
-  uint8_t from[256];
-  uint8_t to[256];
-};
-
-Changes changes_of(const uint8_t *map) {
-  Changes c;
-  for (int b = 0; b < 256; ++b)
-    if (map[b] != b) {
-      c.from[c.count] = static_cast<uint8_t>(b);
-      c.to[c.count] = map[b];
-      ++c.count;
-    }
-  return c;
-}
-
-int64_t map_sse2(const Changes &c, const uint8_t *in, uint8_t *out, int64_t n) {
-  __m128i from[kSse2MaxChanges], to[kSse2MaxChanges];
-  for (int k = 0; k < c.count; ++k) {
-    from[k] = _mm_set1_epi8(static_cast<char>(c.from[k]));
-    to[k] = _mm_set1_epi8(static_cast<char>(c.to[k]));
+int64_t map_sse2(int changes, const uint8_t *from, const uint8_t *to, const uint8_t *in,
+                 uint8_t *out, int64_t n) {
+  __m128i f[ByteMap::kSse2MaxChanges], t[ByteMap::kSse2MaxChanges];
+  for (int k = 0; k < changes; ++k) {
+    f[k] = _mm_set1_epi8(static_cast<char>(from[k]));
+    t[k] = _mm_set1_epi8(static_cast<char>(to[k]));
   }
   int64_t i = 0;
   for (; i + 16 <= n; i += 16) {
     const __m128i v = _mm_loadu_si128(reinterpret_cast<const __m128i *>(in + i));
     __m128i r = v;
-    for (int k = 0; k < c.count; ++k) {
-      const __m128i m = _mm_cmpeq_epi8(v, from[k]);
-      r = _mm_or_si128(_mm_and_si128(m, to[k]), _mm_andnot_si128(m, r));
+    for (int k = 0; k < changes; ++k) {
+      const __m128i m = _mm_cmpeq_epi8(v, f[k]);
+      r = _mm_or_si128(_mm_and_si128(m, t[k]), _mm_andnot_si128(m, r));
     }
     _mm_storeu_si128(reinterpret_cast<__m128i *>(out + i), r);
   }
@@ -73,17 +53,13 @@ int64_t map_sse2(const Changes &c, const uint8_t *in, uint8_t *out, int64_t n) {
 NLSSM_TARGET_AVX2_BEGIN
 namespace {
 
-int64_t map_avx2(const uint8_t *map, const uint8_t *in, uint8_t *out, int64_t n) {
-  __m256i table[16], group[16];
-  int groups = 0;
-  for (int g = 0; g < 16; ++g) {
-    bool changed = false;
-    for (int l = 0; l < 16; ++l) changed |= map[g * 16 + l] != g * 16 + l;
-    if (!changed) continue;
-    const __m128i t = _mm_loadu_si128(reinterpret_cast<const __m128i *>(map + g * 16));
-    table[groups] = _mm256_broadcastsi128_si256(t);
-    group[groups] = _mm256_set1_epi8(static_cast<char>(g));
-    ++groups;
+int64_t map_avx2(int groups, const uint8_t *group, const uint8_t (*tables)[16], const uint8_t *in,
+                 uint8_t *out, int64_t n) {
+  __m256i table[16], id[16];
+  for (int k = 0; k < groups; ++k) {
+    table[k] =
+        _mm256_broadcastsi128_si256(_mm_load_si128(reinterpret_cast<const __m128i *>(tables[k])));
+    id[k] = _mm256_set1_epi8(static_cast<char>(group[k]));
   }
   const __m256i low4 = _mm256_set1_epi8(0x0F);
   int64_t i = 0;
@@ -92,10 +68,8 @@ int64_t map_avx2(const uint8_t *map, const uint8_t *in, uint8_t *out, int64_t n)
     const __m256i hi = _mm256_and_si256(_mm256_srli_epi16(v, 4), low4);
     const __m256i lo = _mm256_and_si256(v, low4);
     __m256i r = v;
-    for (int k = 0; k < groups; ++k) {
-      const __m256i m = _mm256_cmpeq_epi8(hi, group[k]);
-      r = _mm256_blendv_epi8(r, _mm256_shuffle_epi8(table[k], lo), m);
-    }
+    for (int k = 0; k < groups; ++k)
+      r = _mm256_blendv_epi8(r, _mm256_shuffle_epi8(table[k], lo), _mm256_cmpeq_epi8(hi, id[k]));
     _mm256_storeu_si256(reinterpret_cast<__m256i *>(out + i), r);
   }
   return i;
@@ -108,20 +82,39 @@ MapIsa best_map_isa() {
   return kernel::cpu::supports(kernel::cpu::Isa::avx2) ? MapIsa::kAvx2 : MapIsa::kSse2;
 }
 
-void map_bytes(MapIsa isa, const uint8_t *map, const uint8_t *in, uint8_t *out, int64_t n) {
-  if (n <= 0) return;
-  int64_t done = 0;
-  if (isa == MapIsa::kAvx2 && kernel::cpu::supports(kernel::cpu::Isa::avx2)) {
-    done = map_avx2(map, in, out, n);
-  } else if (isa != MapIsa::kScalar) {
-    const Changes c = changes_of(map);
-    if (c.count == 0) {
-      if (in != out) std::memcpy(out, in, static_cast<size_t>(n));
-      return;
+ByteMap::ByteMap(const uint8_t *table, MapIsa isa) : isa_(isa) {
+  std::memcpy(table_, table, 256);
+  if (isa_ == MapIsa::kAvx2 && !kernel::cpu::supports(kernel::cpu::Isa::avx2)) isa_ = MapIsa::kSse2;
+  for (int b = 0; b < 256; ++b) {
+    if (table[b] == b) continue;
+    if (changes_ < kSse2MaxChanges) {
+      from_[changes_] = static_cast<uint8_t>(b);
+      to_[changes_] = table[b];
     }
-    if (c.count <= kSse2MaxChanges) done = map_sse2(c, in, out, n);
+    ++changes_;
   }
-  map_scalar(map, in + done, out + done, n - done);
+  for (int g = 0; g < 16; ++g) {
+    bool changed = false;
+    for (int l = 0; l < 16; ++l) changed |= table[g * 16 + l] != g * 16 + l;
+    if (!changed) continue;
+    std::memcpy(group_table_[groups_], table + g * 16, 16);
+    group_[groups_++] = static_cast<uint8_t>(g);
+  }
+}
+
+void ByteMap::apply(const uint8_t *in, uint8_t *out, int64_t n) const {
+  if (n <= 0) return;
+  if (changes_ == 0 && isa_ != MapIsa::kScalar) {
+    if (in != out) std::memcpy(out, in, static_cast<size_t>(n));
+    return;
+  }
+  int64_t done = 0;
+  if (isa_ == MapIsa::kAvx2) {
+    done = map_avx2(groups_, group_, group_table_, in, out, n);
+  } else if (isa_ == MapIsa::kSse2 && changes_ <= kSse2MaxChanges) {
+    done = map_sse2(changes_, from_, to_, in, out, n);
+  }
+  map_scalar(table_, in + done, out + done, n - done);
 }
 
 }  // namespace nlssm::edit

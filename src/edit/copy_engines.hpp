@@ -64,6 +64,8 @@ struct UtfChars : NoShifts {
   static bool starts_char(uint8_t b) {
     return !(kUtfe ? cursor::utfe_trailing(b) : cursor::utf8_continuation(b));
   }
+  // A byte that is a whole character by itself.
+  static bool single_char(uint8_t b) { return kUtfe ? cursor::kSkipUtfe[b] == 1 : b < 0x80; }
   Char at(const uint8_t *p, int64_t remaining, uint32_t) const {
     const uint8_t b = *p;
     const bool trailing = kUtfe ? cursor::utfe_trailing(b) : cursor::utf8_continuation(b);
@@ -306,6 +308,11 @@ class Writer {
     used_ += n;
   }
   int64_t left() const { return room_ - used_; }
+  // The next n bytes of room (no more than left()), to be filled by the caller.
+  uint8_t *claim(int64_t n) {
+    used_ += n;
+    return out_ + used_ - n;
+  }
 
   // Closes an open double-byte run; the bytes written.
   int64_t finish() {

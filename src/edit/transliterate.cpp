@@ -36,23 +36,44 @@ Result transliterate_bytes(const TranslitArgs &a, int64_t pairs, uint8_t *out, i
   int64_t count = a.src.length;
   if (a.n > 0 && a.n < count) count = a.n;
   const int64_t done = count < room ? count : room;
-  map_bytes(best_map_isa(), map, a.src.p, out, done);
+  ByteMap(map, best_map_isa()).apply(a.src.p, out, done);
   return {count > room ? kDestTooSmall : kOk, done};
 }
 
 // The pairs in effect, the first kCached of them read once into arrays, the
-// rest read from the lists when a character gets that far.
+// rest read from the lists when a character gets that far. For UTF text
+// also a byte table of the single-byte characters: each maps to itself or
+// to the single-byte character its first pair gives, and `runs` marks
+// those that can be mapped byte by byte.
 template <class C>
 class Pairs {
  public:
   static constexpr int64_t kCached = 64;
+  static constexpr bool kByteRuns = C::kSelfSync && !C::kBytes;
 
   Pairs(const C &c, const TranslitArgs &a, int64_t count) : c_(&c), a_(&a), count_(count) {
+    bool paired[256] = {};
+    for (int b = 0; b < 256; ++b) {
+      bytes[b] = static_cast<uint8_t>(b);
+      if constexpr (kByteRuns) runs[b] = C::single_char(static_cast<uint8_t>(b));
+    }
     Reader<C> from(c, a.from), to(c, a.to);
-    while (cached_ < count && cached_ < kCached && from.next(from_[cached_]) &&
-           to.next(to_[cached_]))
-      starts_[*from_[cached_++].p] = true;
-    for (Char f; cached_ + seen_ < count && from.next(f); ++seen_) starts_[*f.p] = true;
+    Char f, t;
+    for (int64_t i = 0; i < count && from.next(f) && to.next(t); ++i) {
+      if (i < kCached) {
+        from_[i] = f;
+        to_[i] = t;
+        cached_ = i + 1;
+      }
+      starts_[*f.p] = true;
+      if (f.size != 1 || paired[*f.p]) continue;
+      paired[*f.p] = true;
+      if (t.size == 1) {
+        bytes[*f.p] = *t.p;
+      } else {
+        runs[*f.p] = false;
+      }
+    }
   }
 
   // The to-character of the first from-character equal to ch, or ch.
@@ -60,7 +81,7 @@ class Pairs {
     if (!starts_[*ch.p]) return ch;
     for (int64_t i = 0; i < cached_; ++i)
       if (same(from_[i], ch)) return to_[i];
-    if (seen_ == 0) return ch;
+    if (count_ <= cached_) return ch;
     Reader<C> from(*c_, a_->from), to(*c_, a_->to);
     Char f, t;
     for (int64_t i = 0; i < count_ && from.next(f) && to.next(t); ++i)
@@ -68,12 +89,14 @@ class Pairs {
     return ch;
   }
 
+  uint8_t bytes[256];
+  bool runs[256] = {};
+
  private:
   const C *c_;
   const TranslitArgs *a_;
   int64_t count_;
   int64_t cached_ = 0;
-  int64_t seen_ = 0;  // pairs beyond the cached ones
   bool starts_[256] = {};
   Char from_[kCached], to_[kCached];
 };
@@ -85,11 +108,26 @@ Result transliterate(const C &c, const TranslitArgs &a, uint8_t *out, int64_t ro
     return transliterate_bytes(a, pairs, out, room);
   } else {
     const Pairs<C> table(c, a, pairs);
+    const ByteMap bytes(table.bytes, Pairs<C>::kByteRuns ? best_map_isa() : MapIsa::kScalar);
     Reader<C> src(c, a.src);
     Writer<C> w(c, out, room, dbl);
     int64_t left = a.n > 0 ? a.n : -1;
     Char ch;
-    while (left != 0 && src.next(ch)) {
+    while (left != 0 && src.off < src.end) {
+      if constexpr (Pairs<C>::kByteRuns) {  // a run of single-byte characters at once
+        const int64_t limit = left > 0 && left < src.end - src.off ? src.off + left : src.end;
+        int64_t run = src.off;
+        while (run < limit && table.runs[src.p[run]]) ++run;
+        if (run > src.off) {
+          const int64_t take = run - src.off < w.left() ? run - src.off : w.left();
+          bytes.apply(src.p + src.off, w.claim(take), take);
+          src.off += take;
+          if (left > 0) left -= take;
+          if (src.off < run) return {kDestTooSmall, w.finish()};
+          continue;
+        }
+      }
+      if (!src.next(ch)) break;
       if (!w.put(table.map(ch))) return {kDestTooSmall, w.finish()};
       if (left > 0) --left;
     }

@@ -23,7 +23,7 @@ TEST(ByteMap, EveryPathMapsLikeTheTable) {
       for (auto &b : in) b = static_cast<uint8_t>(rng());
       for (MapIsa isa : {MapIsa::kScalar, MapIsa::kSse2, MapIsa::kAvx2}) {
         std::vector<uint8_t> out(in.size() + 8, 0xEE);
-        nlssm::edit::map_bytes(isa, map, in.data() + 1, out.data(), n);
+        nlssm::edit::ByteMap(map, isa).apply(in.data() + 1, out.data(), n);
         for (int64_t i = 0; i < n; ++i)
           ASSERT_EQ(out[i], map[in[i + 1]]) << changes << " changes, n " << n << " at " << i;
         EXPECT_EQ(out[n], 0xEE);
