@@ -1017,10 +1017,11 @@ NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string
  * 0 and length count; otherwise length is the position plus count;
  * nextOffset is the position plus one. When the destination's buffer
  * overlaps the source text, the result is built in a work buffer of the
- * destination's capacity (from the handle's pool, else 2048 bytes on the
- * stack with the room cut to 2048), copied to the start of the destination,
- * which is then positioned at its first character. S forms apply the same
- * overlap rule to the destination buffer.
+ * destination's capacity (on the stack up to 2048 bytes, beyond that from
+ * the handle's pool, or, when the pool refuses, 2048 bytes on the stack with
+ * the room cut to 2048), copied to the start of the destination, which is
+ * then positioned at its first character. S forms apply the same overlap
+ * rule to the destination buffer.
  *
  * Null descriptors, buffers with text or lists: NLSSM_E_NULL_ARGUMENT. The
  * trailing flags words are reserved; pass 0. */
