@@ -408,9 +408,10 @@ int64_t into_descriptor(NLSString *dst, int64_t *written, Write &&write) {
 }
 
 // Plain front end: when the destination's buffer overlaps the source text,
-// the engine writes into a copy of the destination (a buffer of its room
-// from the handle's pool, else 2048 bytes on the stack with the room cut to
-// that), which is copied back and re-positioned at its start afterwards.
+// the engine writes into a copy of the destination (a buffer of its room:
+// on the stack up to 2048 bytes, from the handle's pool beyond that, and
+// 2048 bytes on the stack with the room cut to that when the pool refuses),
+// which is copied back and re-positioned at its start afterwards.
 template <class Engine>
 int64_t plain_front(const NLSSMHandle *h, const Span &source, NLSString *dst, int64_t *written,
                     Engine &&engine) {
