@@ -232,6 +232,7 @@ TEST_P(CopyEdits, TransliterateReplacesByPairsFirstMatchWinning) {
   expect(translit("ab", "XY", "ab", 1), 0, "Xb");
   expect(translit("ab", "XY", "ab", 99), 0, "XY");
   expect(translit("abab", "X", "a", 0, 64, 3), 0, "XbX");
+  expect(translit("abW", std::string(68, 'c') + "XY", std::string(68, 'b') + "aW"), 0, "XcY");
 }
 
 TEST_P(CopyEdits, TranwordReplacesWholeWordsWithoutOverlap) {
