@@ -1364,6 +1364,321 @@ NLSSM_API int64_t NLSStringLike_MBCS_nonmodal2_EBCDIC(const NLSSMHandle *handle,
 /* ---- Move, fill, concatenate, justify and add quotes ---------------------- */
 
 /* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
+/* Four copying edits: each reads a source and writes the result into a
+ * separate destination; results are statuses. Plain forms take descriptors
+ * and read from the current character; S forms take buffers with byte
+ * lengths and read the whole buffer. `written` (may be null) receives the
+ * bytes written. Members: _SBCS, _UTF8 (UTF-8 and UTF-EBCDIC), _WCS2, _WCS4,
+ * _DBCS (double-byte code pages, EUC-JP, EUC-TW, GB18030) and _DBCSM
+ * (shift-out/shift-in text).
+ *
+ * Characters are compared and copied whole: one byte, a UTF-8 or UTF-EBCDIC
+ * lead with its continuation bytes (a stray continuation byte or a
+ * sequence cut short is a character of its own), a two-byte unit or a
+ * surrogate pair, a four-byte unit (compared in memory order), or the
+ * class's double-byte, EUC or GB18030 character (a lead byte without its
+ * trail bytes is one byte). A trailing partial unit of wide text is ignored.
+ * In shift-out/shift-in text shift sequences only set the width of the
+ * characters after them: characters of different widths never compare
+ * equal, and the output gets a shift-out or shift-in wherever the width
+ * changes, keeps room for the closing shift-in while a double-byte run is
+ * open, and closes it at the end. A character that does not fit is never
+ * split.
+ *
+ * Destination (plain forms): writing starts at the destination's
+ * curOffset (an unset one counts as 0; in modal text inside a double-byte
+ * run when its charKind says so) and may use its capacity from there. After
+ * writing `count` bytes: an unset destination that got text has curOffset
+ * 0 and length count; otherwise length is the position plus count;
+ * nextOffset is the position plus one. When the destination's buffer
+ * overlaps the source text, the result is built in a work buffer of the
+ * destination's capacity (on the stack up to 2048 bytes, beyond that from
+ * the handle's pool, or, when the pool refuses, 2048 bytes on the stack with
+ * the room cut to 2048), copied to the start of the destination, which is
+ * then positioned at its first character. S forms apply the same overlap
+ * rule to the destination buffer.
+ *
+ * Null descriptors, buffers with text or lists: NLSSM_E_NULL_ARGUMENT. The
+ * trailing flags words are reserved; pass 0. */
+
+/* Transliterate: each source character found among the first pairCount
+ * characters of fromList is replaced by the toList character at the same
+ * index (the first match wins); others are copied. pairCount 0 or less: the
+ * shorter list's character count; a larger pairCount is cut to it. n: the
+ * characters of the source to process, 0 or less for all. Status
+ * NLSSM_E_DEST_TOO_SMALL when the characters do not all fit; what fits is
+ * written. */
+
+NLSSM_API int64_t NLSStringTransliterate_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                              int64_t n, const NLSString *toList,
+                                              const NLSString *fromList, int64_t pairCount,
+                                              NLSString *destination, int64_t *written,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringTransliterate_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                              int64_t n, const NLSString *toList,
+                                              const NLSString *fromList, int64_t pairCount,
+                                              NLSString *destination, int64_t *written,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringTransliterate_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                              int64_t n, const NLSString *toList,
+                                              const NLSString *fromList, int64_t pairCount,
+                                              NLSString *destination, int64_t *written,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringTransliterate_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                              int64_t n, const NLSString *toList,
+                                              const NLSString *fromList, int64_t pairCount,
+                                              NLSString *destination, int64_t *written,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringTransliterate_DBCS(const NLSSMHandle *handle, const NLSString *source,
+                                              int64_t n, const NLSString *toList,
+                                              const NLSString *fromList, int64_t pairCount,
+                                              NLSString *destination, int64_t *written,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringTransliterate_DBCSM(const NLSSMHandle *handle, const NLSString *source,
+                                               int64_t n, const NLSString *toList,
+                                               const NLSString *fromList, int64_t pairCount,
+                                               NLSString *destination, int64_t *written,
+                                               int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, const uint8_t *toList,
+                                               int64_t toLength, const uint8_t *fromList,
+                                               int64_t fromLength, int64_t pairCount,
+                                               uint8_t *destination, int64_t destinationLength,
+                                               int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, const uint8_t *toList,
+                                               int64_t toLength, const uint8_t *fromList,
+                                               int64_t fromLength, int64_t pairCount,
+                                               uint8_t *destination, int64_t destinationLength,
+                                               int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, const uint8_t *toList,
+                                               int64_t toLength, const uint8_t *fromList,
+                                               int64_t fromLength, int64_t pairCount,
+                                               uint8_t *destination, int64_t destinationLength,
+                                               int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, const uint8_t *toList,
+                                               int64_t toLength, const uint8_t *fromList,
+                                               int64_t fromLength, int64_t pairCount,
+                                               uint8_t *destination, int64_t destinationLength,
+                                               int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_DBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, const uint8_t *toList,
+                                               int64_t toLength, const uint8_t *fromList,
+                                               int64_t fromLength, int64_t pairCount,
+                                               uint8_t *destination, int64_t destinationLength,
+                                               int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_DBCSM(const NLSSMHandle *handle, const uint8_t *source,
+                                                int64_t sourceLength, const uint8_t *toList,
+                                                int64_t toLength, const uint8_t *fromList,
+                                                int64_t fromLength, int64_t pairCount,
+                                                uint8_t *destination, int64_t destinationLength,
+                                                int64_t *written, int64_t flags);
+/* The lists as literals in the host's literal encoding (62), converted
+ * through the handle's charConverter, then the handle's NLSStringTransliterate
+ * (or NLSStringTransliterateS) operation. A failed conversion returns its
+ * status (NLSSM_E_NO_MEMORY when the buffer for it could not be had). */
+NLSSM_API int64_t NLSStringTransliterateLit(const NLSSMHandle *handle, const NLSString *source,
+                                            int64_t n, const uint8_t *toList, int64_t toLength,
+                                            const uint8_t *fromList, int64_t fromLength,
+                                            int64_t pairCount, NLSString *destination,
+                                            int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateLitS(const NLSSMHandle *handle, const uint8_t *source,
+                                             int64_t sourceLength, const uint8_t *toList,
+                                             int64_t toLength, const uint8_t *fromList,
+                                             int64_t fromLength, int64_t pairCount,
+                                             uint8_t *destination, int64_t destinationLength,
+                                             int64_t *written, int64_t flags);
+
+/* Tranword: every occurrence of the word `find` in the source is replaced by
+ * `replacement`; matches do not overlap and replaced text is not searched
+ * again. Each character copied counts n down by one, each replacement by
+ * findLength (not below 0); the copy stops when n reaches 0, at the end of
+ * the source, or when the room is used up. Plain form: n, replacementLength
+ * and findLength that are 0 (or less) are each taken as the source's
+ * character count (NLSNumChars); the words themselves are their descriptors'
+ * text from the current character, so with findLength 0 the first
+ * replacement uses up n and the rest of the source is not copied.
+ * replacementLength has no other effect. S form: n is the source's
+ * character count, the words are the given buffers, and each replacement
+ * counts n down by the find word's character count. An empty find word
+ * matches nothing; an empty replacement deletes the word. Status
+ * NLSSM_E_DEST_TOO_SMALL when the room ran out before n did, or a
+ * replacement did not fit (the source is then copied on as far as it fits).
+ * Words are matched character by character at character starts. */
+NLSSM_API int64_t NLSStringTranword_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *replacement,
+                                         int64_t replacementLength, const NLSString *find,
+                                         int64_t findLength, NLSString *destination,
+                                         int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranword_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *replacement,
+                                         int64_t replacementLength, const NLSString *find,
+                                         int64_t findLength, NLSString *destination,
+                                         int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranword_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *replacement,
+                                         int64_t replacementLength, const NLSString *find,
+                                         int64_t findLength, NLSString *destination,
+                                         int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranword_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *replacement,
+                                         int64_t replacementLength, const NLSString *find,
+                                         int64_t findLength, NLSString *destination,
+                                         int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranword_DBCS(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *replacement,
+                                         int64_t replacementLength, const NLSString *find,
+                                         int64_t findLength, NLSString *destination,
+                                         int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranword_DBCSM(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, const NLSString *replacement,
+                                          int64_t replacementLength, const NLSString *find,
+                                          int64_t findLength, NLSString *destination,
+                                          int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *replacement,
+                                          int64_t replacementLength, const uint8_t *find,
+                                          int64_t findLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written,
+                                          int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *replacement,
+                                          int64_t replacementLength, const uint8_t *find,
+                                          int64_t findLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written,
+                                          int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *replacement,
+                                          int64_t replacementLength, const uint8_t *find,
+                                          int64_t findLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written,
+                                          int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *replacement,
+                                          int64_t replacementLength, const uint8_t *find,
+                                          int64_t findLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written,
+                                          int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_DBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *replacement,
+                                          int64_t replacementLength, const uint8_t *find,
+                                          int64_t findLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written,
+                                          int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_DBCSM(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, const uint8_t *replacement,
+                                           int64_t replacementLength, const uint8_t *find,
+                                           int64_t findLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *written,
+                                           int64_t flags);
+
+/* Squeeze: every run of the squeeze character among the first n characters
+ * of the source (0 or less: all) is reduced to one; other characters are
+ * copied. The squeeze character is the character at squeezeChar's current
+ * position (plain) or the first character of the squeezeChar buffer (S);
+ * when there is none, the source is copied unchanged. Status
+ * NLSSM_E_DEST_TOO_SMALL when the destination is full before the source is
+ * used up. */
+NLSSM_API int64_t NLSStringSqueeze_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                        int64_t n, const NLSString *squeezeChar,
+                                        NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueeze_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                        int64_t n, const NLSString *squeezeChar,
+                                        NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueeze_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                        int64_t n, const NLSString *squeezeChar,
+                                        NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueeze_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                        int64_t n, const NLSString *squeezeChar,
+                                        NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueeze_DBCS(const NLSSMHandle *handle, const NLSString *source,
+                                        int64_t n, const NLSString *squeezeChar,
+                                        NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueeze_DBCSM(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *squeezeChar,
+                                         NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                         int64_t sourceLength, const uint8_t *squeezeChar,
+                                         int64_t squeezeLength, uint8_t *destination,
+                                         int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                         int64_t sourceLength, const uint8_t *squeezeChar,
+                                         int64_t squeezeLength, uint8_t *destination,
+                                         int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                         int64_t sourceLength, const uint8_t *squeezeChar,
+                                         int64_t squeezeLength, uint8_t *destination,
+                                         int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                         int64_t sourceLength, const uint8_t *squeezeChar,
+                                         int64_t squeezeLength, uint8_t *destination,
+                                         int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_DBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                         int64_t sourceLength, const uint8_t *squeezeChar,
+                                         int64_t squeezeLength, uint8_t *destination,
+                                         int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_DBCSM(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *squeezeChar,
+                                          int64_t squeezeLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written);
+/* Squeeze with the first character of a literal in the host's literal
+ * encoding (62), converted through the handle's charConverter, through the
+ * handle's NLSStringSqueeze (or NLSStringSqueezeS) operation. An empty
+ * literal (length 0 or less) squeezes the handle's blank character.
+ * `characters` (may be null) receives the characters written, counted
+ * through the handle's NLSNumCharsS, beside the bytes in `written`. The S
+ * form takes the arguments of the plain one with buffers and byte lengths
+ * for the source and destination and no n. NLSSM_E_NO_MEMORY when the
+ * buffer for the converted literal could not be had from the handle's pool;
+ * another failed conversion returns its status. */
+NLSSM_API int64_t NLSStringSqueezeLit(const NLSSMHandle *handle, const NLSString *source, int64_t n,
+                                      const uint8_t *literal, int64_t literalLength,
+                                      NLSString *destination, int64_t *written, int64_t *characters,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringSqueezeLitS(const NLSSMHandle *handle, const uint8_t *source,
+                                       int64_t sourceLength, const uint8_t *literal,
+                                       int64_t literalLength, uint8_t *destination,
+                                       int64_t destinationLength, int64_t *written,
+                                       int64_t *characters, int64_t flags);
+
+/* Remove delimiters: the source's first character is the delimiter and its
+ * last character the closing one, which is dropped; the characters between
+ * are copied, a doubled delimiter as one (the inverse of add-quotes). A
+ * full destination ends the copy with status 0. NLSSM_E_DEST_TOO_SMALL only
+ * when the source holds fewer than two characters (nothing is written). */
+NLSSM_API int64_t NLSStringRemoveDelimiters_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                                 NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimiters_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                                 NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimiters_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                                 NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimiters_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                                 NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimiters_DBCS(const NLSSMHandle *handle, const NLSString *source,
+                                                 NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimiters_DBCSM(const NLSSMHandle *handle,
+                                                  const NLSString *source, NLSString *destination,
+                                                  int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                                  int64_t sourceLength, uint8_t *destination,
+                                                  int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                                  int64_t sourceLength, uint8_t *destination,
+                                                  int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                                  int64_t sourceLength, uint8_t *destination,
+                                                  int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                                  int64_t sourceLength, uint8_t *destination,
+                                                  int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_DBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                                  int64_t sourceLength, uint8_t *destination,
+                                                  int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_DBCSM(const NLSSMHandle *handle, const uint8_t *source,
+                                                   int64_t sourceLength, uint8_t *destination,
+                                                   int64_t destinationLength, int64_t *written);
 
 /* ---- Number parsing and formatting ---------------------------------------- */
 /* Slots 29-32. Every member takes the handle, then a host locale object (null:

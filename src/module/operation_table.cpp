@@ -230,6 +230,42 @@ const std::array kRows = {
          endian(op(&NLSStringVerifyS_WCS2L), op(&NLSStringVerifyS_WCS2B)),
          same(op(&NLSStringVerifyS_WCS4)), same(op(&NLSStringVerifyS_MBCS_modal)),
          same(op(&NLSStringVerifyS_MBCS_nonmodal))}},
+    every_class(89, op(&NLSStringTransliterateLit)),
+    every_class(90, op(&NLSStringTransliterateLitS)),
+    Row{91,  // NLSStringTransliterate
+        {same(op(&NLSStringTransliterate_SBCS)), same(op(&NLSStringTransliterate_UTF8)),
+         same(op(&NLSStringTransliterate_WCS2)), same(op(&NLSStringTransliterate_WCS4)),
+         same(op(&NLSStringTransliterate_DBCSM)), same(op(&NLSStringTransliterate_DBCS))}},
+    Row{92,  // NLSStringTransliterateS
+        {same(op(&NLSStringTransliterateS_SBCS)), same(op(&NLSStringTransliterateS_UTF8)),
+         same(op(&NLSStringTransliterateS_WCS2)), same(op(&NLSStringTransliterateS_WCS4)),
+         same(op(&NLSStringTransliterateS_DBCSM)), same(op(&NLSStringTransliterateS_DBCS))}},
+    Row{93,  // NLSStringRemoveDelimiters
+        {same(op(&NLSStringRemoveDelimiters_SBCS)), same(op(&NLSStringRemoveDelimiters_UTF8)),
+         same(op(&NLSStringRemoveDelimiters_WCS2)), same(op(&NLSStringRemoveDelimiters_WCS4)),
+         same(op(&NLSStringRemoveDelimiters_DBCSM)), same(op(&NLSStringRemoveDelimiters_DBCS))}},
+    Row{94,  // NLSStringRemoveDelimitersS
+        {same(op(&NLSStringRemoveDelimitersS_SBCS)), same(op(&NLSStringRemoveDelimitersS_UTF8)),
+         same(op(&NLSStringRemoveDelimitersS_WCS2)), same(op(&NLSStringRemoveDelimitersS_WCS4)),
+         same(op(&NLSStringRemoveDelimitersS_DBCSM)), same(op(&NLSStringRemoveDelimitersS_DBCS))}},
+    Row{95,  // NLSStringTranword
+        {same(op(&NLSStringTranword_SBCS)), same(op(&NLSStringTranword_UTF8)),
+         same(op(&NLSStringTranword_WCS2)), same(op(&NLSStringTranword_WCS4)),
+         same(op(&NLSStringTranword_DBCSM)), same(op(&NLSStringTranword_DBCS))}},
+    Row{96,  // NLSStringTranwordS
+        {same(op(&NLSStringTranwordS_SBCS)), same(op(&NLSStringTranwordS_UTF8)),
+         same(op(&NLSStringTranwordS_WCS2)), same(op(&NLSStringTranwordS_WCS4)),
+         same(op(&NLSStringTranwordS_DBCSM)), same(op(&NLSStringTranwordS_DBCS))}},
+    every_class(97, op(&NLSStringSqueezeLit)),
+    every_class(98, op(&NLSStringSqueezeLitS)),
+    Row{99,  // NLSStringSqueeze
+        {same(op(&NLSStringSqueeze_SBCS)), same(op(&NLSStringSqueeze_UTF8)),
+         same(op(&NLSStringSqueeze_WCS2)), same(op(&NLSStringSqueeze_WCS4)),
+         same(op(&NLSStringSqueeze_DBCSM)), same(op(&NLSStringSqueeze_DBCS))}},
+    Row{100,  // NLSStringSqueezeS
+        {same(op(&NLSStringSqueezeS_SBCS)), same(op(&NLSStringSqueezeS_UTF8)),
+         same(op(&NLSStringSqueezeS_WCS2)), same(op(&NLSStringSqueezeS_WCS4)),
+         same(op(&NLSStringSqueezeS_DBCSM)), same(op(&NLSStringSqueezeS_DBCS))}},
     Row{101,  // NLSStringNLength
         {same(op(&NLSStringNLength_SBCS)), same(op(&NLSStringNLength_UTF8)),
          same(op(&NLSStringNLength_WCS2)), same(op(&NLSStringNLength_WCS4)),
