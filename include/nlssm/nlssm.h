@@ -987,6 +987,94 @@ NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string
 /* ---- Substring, delete, reverse and strip --------------------------------- */
 
 /* ---- Move, fill, concatenate, justify and add quotes ---------------------- */
+/* Move (slots 63, 115): copies sourceLength bytes of source (characters
+ * with flag NLSSM_EDIT_SOURCE_IN_CHARS; the fixed-width members count units,
+ * the others whole characters, which the source must hold) into the
+ * destinationLength bytes at destination, in whole characters. Too little
+ * room: what fits is copied, 0x803fe807, no padding. Otherwise flag
+ * NLSSM_EDIT_PAD blank-pads the rest of the room. Source and destination may
+ * overlap. The double-byte non-modal members pad with the byte 0x20 and
+ * report 0x803fe807 only when something was copied. The modal member keeps
+ * shift sequences balanced: a leading shift-in and a trailing shift-out are
+ * dropped, a copy ending in a double-byte run is closed with a shift-in
+ * (double-byte characters are given back to make room for it, with
+ * 0x803fe807); the same buffer as source and destination, without padding
+ * and ending in single-byte width, is only measured. The UTF-8 member sizes
+ * UTF-EBCDIC text by its own rule. Counts (may be null): bytes written,
+ * padding excluded; characters written (units for the fixed-width members).
+ * Null buffers with a non-zero length: 0x803fe82a. */
+NLSSM_API int64_t NLSStringMoveS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *bytesWritten,
+                                           uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *bytesWritten,
+                                           int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceLength, uint8_t *destination,
+                                            int64_t destinationLength, int64_t *bytesWritten,
+                                            uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceLength, uint8_t *destination,
+                                            int64_t destinationLength, int64_t *bytesWritten,
+                                            int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, uint8_t *destination,
+                                               int64_t destinationLength, int64_t *bytesWritten,
+                                               uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, uint8_t *destination,
+                                               int64_t destinationLength, int64_t *bytesWritten,
+                                               int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                      const uint8_t *source, int64_t sourceLength,
+                                                      uint8_t *destination,
+                                                      int64_t destinationLength,
+                                                      int64_t *bytesWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal_EUC_JP(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *bytesWritten, int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                      const uint8_t *source, int64_t sourceLength,
+                                                      uint8_t *destination,
+                                                      int64_t destinationLength,
+                                                      int64_t *bytesWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal_EUC_TW(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *bytesWritten, int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                       const uint8_t *source, int64_t sourceLength,
+                                                       uint8_t *destination,
+                                                       int64_t destinationLength,
+                                                       int64_t *bytesWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal_GB18030(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *bytesWritten, int64_t *charsWritten, uint32_t flags);
 
 /* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
 

@@ -114,6 +114,13 @@ const std::array kRows = {
         {same(op(&NLSAllBlanksS_SBCS)), same(op(&NLSAllBlanksS)), same(op(&NLSAllBlanksS_WCS)),
          same(op(&NLSAllBlanksS_WCS)), same(op(&NLSAllBlanksS_MBCS_modal)),
          same(op(&NLSAllBlanksS))}},
+    Row{63,  // NLSStringMoveS
+        {same(op(&NLSStringMoveS_SBCS)), same(op(&NLSStringMoveS_MBCS_UTF8)),
+         same(op(&NLSStringMoveS_WCS2)), same(op(&NLSStringMoveS_WCS4)),
+         same(op(&NLSStringMoveS_MBCS_modal)),
+         dbcs(op(&NLSStringMoveS_MBCS_nonmodal), op(&NLSStringMoveS_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringMoveS_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringMoveS_MBCS_nonmodal_GB18030))}},
     Row{72,  // NLSStringLength
         {same(op(&NLSStringLength_SBCS)), utf(op(&NLSStringLength_UTF8), op(&NLSStringLength_UTFE)),
          same(op(&NLSStringLength_WCS2)), same(op(&NLSStringLength_WCS4)),
@@ -138,6 +145,13 @@ const std::array kRows = {
          same(op(&NLSStringByteLengthC_MBCS_modal)),
          dbcs(op(&NLSStringByteLengthC_MBCS_nonmodal), op(&NLSStringByteLengthC_MBCS_EUC_JP),
               op(&NLSStringByteLengthC_MBCS_EUC_TW), op(&NLSStringByteLengthC_MBCS_GB18030))}},
+    Row{115,  // NLSStringMoveC
+        {same(op(&NLSStringMoveC_SBCS)), same(op(&NLSStringMoveC_MBCS_UTF8)),
+         same(op(&NLSStringMoveC_WCS2)), same(op(&NLSStringMoveC_WCS4)),
+         same(op(&NLSStringMoveC_MBCS_modal)),
+         dbcs(op(&NLSStringMoveC_MBCS_nonmodal), op(&NLSStringMoveC_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringMoveC_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringMoveC_MBCS_nonmodal_GB18030))}},
 };
 
 bool is_class_independent(const Row &row) {
