@@ -1076,6 +1076,57 @@ NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal_GB18030(
     const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
     int64_t destinationLength, int64_t *bytesWritten, int64_t *charsWritten, uint32_t flags);
 
+/* Fill (slots 44, 67, 45, 68): repeats one character, in whole characters.
+ * Descriptor forms take the character at fillChar's curOffset (an unset
+ * fillChar: nothing is done, 0) and count `written` in characters. The SBCS
+ * member writes from the byte offset charIndex: length bytes (0 = all the
+ * room up to capacity; more than the room fills the room, 0x803fe807). The
+ * others write from curOffset (the end of the text when unset): lengths of
+ * at least one character give the smaller of the characters asked and the
+ * characters that fit (0x803fe807 when fewer than asked); shorter lengths,
+ * 0 included, fill all whole characters of the room (0x803fe807 when bytes
+ * are left over). The modal member writes a double-byte character as a
+ * shift-out, the characters and a shift-in (whose bytes count in length
+ * and room). The destination's length grows to the end of the fill.
+ * Raw forms repeat the whole fillChar buffer (modal: its first character;
+ * four-byte units: at most 4 bytes) over length bytes from the start,
+ * `written` in bytes; 0x803fe807 when bytes are left over; a fill character
+ * of length 0 is 0x803fe82a. Literal forms convert the literal's first byte
+ * (encoding 62) through charConverter and call the handle's NLSStringFill
+ * or NLSStringFillS; an empty literal is 0x803fe82a. */
+NLSSM_API int64_t NLSStringFill_SBCS(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_SBCS(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_MBCS(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_MBCS(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_WCS2(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_WCS2(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_WCS4(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_WCS4(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_MBCS_modal(const NLSSMHandle *handle, NLSString *destination,
+                                           int64_t length, const NLSString *fillChar,
+                                           int64_t *written);
+NLSSM_API int64_t NLSStringFillS_MBCS_modal(const NLSSMHandle *handle, uint8_t *destination,
+                                            int64_t length, const uint8_t *fillChar,
+                                            int64_t fillLength, int64_t *written);
+NLSSM_API int64_t NLSStringFillLit(const NLSSMHandle *handle, NLSString *destination,
+                                   int64_t length, const uint8_t *literal, int64_t literalLength,
+                                   int64_t *written);
+NLSSM_API int64_t NLSStringFillLitS(const NLSSMHandle *handle, uint8_t *destination, int64_t length,
+                                    const uint8_t *literal, int64_t literalLength,
+                                    int64_t *written);
+
 /* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
 
 /* ---- Number parsing and formatting ---------------------------------------- */

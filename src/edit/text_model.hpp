@@ -106,6 +106,30 @@ using EucTwText = Text<cursor::EucTwModel>;
 using Gb18030Text = Text<cursor::Gb18030Model>;
 using ModalText = Text<cursor::ModalModel>;
 
+// Calls fn with the text model of the handle's encoding in class kClass
+// (class 1: UTF-8 or UTF-EBCDIC; class 5: the double-byte variant by the
+// encoding number).
+template <int kClass, class Fn>
+decltype(auto) with_text(const NLSSMHandle *h, Fn &&fn) {
+  const uint32_t number = h->encodingNumber;
+  if constexpr (kClass == NLSSM_CLASS_SBCS) {
+    return fn(SbcsText(h));
+  } else if constexpr (kClass == NLSSM_CLASS_UTF8) {
+    return number == NLSSM_ENC_UTF8 ? fn(Utf8Text(h)) : fn(UtfeText(h));
+  } else if constexpr (kClass == NLSSM_CLASS_WCS2) {
+    return number == NLSSM_ENC_WCS2_BE ? fn(Wcs2Text<true>(h)) : fn(Wcs2Text<false>(h));
+  } else if constexpr (kClass == NLSSM_CLASS_WCS4) {
+    return fn(Wcs4Text(h));
+  } else if constexpr (kClass == NLSSM_CLASS_MBCS_MODAL) {
+    return fn(ModalText(h));
+  } else {
+    if (number == NLSSM_ENC_EUC_JP) return fn(EucJpText(h));
+    if (number == 119 || number == 120 || number == 159) return fn(EucTwText(h));
+    if (number == NLSSM_ENC_GB18030) return fn(Gb18030Text(h));
+    return fn(DbcsText(h));
+  }
+}
+
 // The blank as the handle stores it: 1, 2 or 4 bytes.
 struct Blank {
   uint8_t bytes[4];

@@ -101,6 +101,11 @@ const std::array kRows = {
          same(op(&NLSStringByteLength_MBCS_modal)),
          dbcs(op(&NLSStringByteLength_MBCS_nonmodal), op(&NLSStringByteLength_MBCS_EUC_JP),
               op(&NLSStringByteLength_MBCS_EUC_TW), op(&NLSStringByteLength_MBCS_GB18030))}},
+    Row{44,  // NLSStringFill
+        {same(op(&NLSStringFill_SBCS)), same(op(&NLSStringFill_MBCS)),
+         same(op(&NLSStringFill_WCS2)), same(op(&NLSStringFill_WCS4)),
+         same(op(&NLSStringFill_MBCS_modal)), same(op(&NLSStringFill_MBCS))}},
+    every_class(45, op(&NLSStringFillLit)),
     Row{48,  // NLSNumCharsS
         {same(op(&NLSNumCharsS_SBCS)), utf(op(&NLSNumCharsS_UTF8), op(&NLSNumCharsS_UTFE)),
          same(op(&NLSNumCharsS_WCS2)), same(op(&NLSNumCharsS_WCS4)),
@@ -121,6 +126,11 @@ const std::array kRows = {
          dbcs(op(&NLSStringMoveS_MBCS_nonmodal), op(&NLSStringMoveS_MBCS_nonmodal_EUC_JP),
               op(&NLSStringMoveS_MBCS_nonmodal_EUC_TW),
               op(&NLSStringMoveS_MBCS_nonmodal_GB18030))}},
+    Row{67,  // NLSStringFillS
+        {same(op(&NLSStringFillS_SBCS)), same(op(&NLSStringFillS_MBCS)),
+         same(op(&NLSStringFillS_WCS2)), same(op(&NLSStringFillS_WCS4)),
+         same(op(&NLSStringFillS_MBCS_modal)), same(op(&NLSStringFillS_MBCS))}},
+    every_class(68, op(&NLSStringFillLitS)),
     Row{72,  // NLSStringLength
         {same(op(&NLSStringLength_SBCS)), utf(op(&NLSStringLength_UTF8), op(&NLSStringLength_UTFE)),
          same(op(&NLSStringLength_WCS2)), same(op(&NLSStringLength_WCS4)),

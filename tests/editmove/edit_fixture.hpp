@@ -39,9 +39,9 @@ constexpr int64_t kGuardBytes = 8;
 struct Guarded {
   std::vector<uint8_t> all;
   int64_t room;
-  explicit Guarded(int64_t room, uint8_t fill = 0xAA)
-      : all(static_cast<size_t>(room + 2 * kGuardBytes), kGuard), room(room) {
-    std::fill(all.begin() + kGuardBytes, all.end() - kGuardBytes, fill);
+  explicit Guarded(int64_t room, uint8_t fill = 0xAA) : all(kGuardBytes, kGuard), room(room) {
+    all.resize(static_cast<size_t>(kGuardBytes + room), fill);
+    all.resize(all.size() + kGuardBytes, kGuard);
   }
   uint8_t *data() { return all.data() + kGuardBytes; }
   std::vector<uint8_t> text(int64_t n) const {
