@@ -1127,6 +1127,61 @@ NLSSM_API int64_t NLSStringFillLitS(const NLSSMHandle *handle, uint8_t *destinat
                                     const uint8_t *literal, int64_t literalLength,
                                     int64_t *written);
 
+/* Concatenate (slots 43, 66): joins `count` pieces (variable arguments:
+ * NLSString pointers for the descriptor forms, from each one's curOffset to
+ * its length, a null or unset one ending the list; (const uint8_t *, int64_t
+ * bytes) pairs for the raw forms) into the destination, with the separator
+ * literal's first byte (encoding 62, converted through charConverter) between
+ * pieces when separatorLength is not 0. Room: *length (descriptor forms; 0 =
+ * up to capacity) or length bytes; a negative length is terminated mode,
+ * room -length - 1 and a zero byte after the text instead of blank padding.
+ * The descriptor forms never write past capacity and write from the byte
+ * offset charIndex (NLSStringConcat, single-byte and UTF-8) or from curOffset
+ * (the others; negative counts as 0). A piece longer than the room left
+ * ends the join with 0x803fe807 after copying what fits in whole characters,
+ * or nothing of it with flag NLSSM_EDIT_PAD; a separator taking the last
+ * byte of room before a piece also gives 0x803fe807. The rest of the room is
+ * blank-filled in normal mode, truncated or not. Modal pieces are moved as
+ * by the modal move (each left in single-byte width), and a destination whose
+ * text ends in a double-byte run at the write offset gets a shift-in first.
+ * The bytes written (separators included, padding excluded) go to *length or
+ * *written (may be null); the descriptor's length becomes the end of the text. */
+NLSSM_API int64_t NLSStringConcat(const NLSSMHandle *handle, NLSString *destination,
+                                  int64_t *length, const uint8_t *separator,
+                                  int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS(const NLSSMHandle *handle, uint8_t *destination, int64_t length,
+                                   int64_t *written, const uint8_t *separator,
+                                   int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcat_WCS2(const NLSSMHandle *handle, NLSString *destination,
+                                       int64_t *length, const uint8_t *separator,
+                                       int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS_WCS2(const NLSSMHandle *handle, uint8_t *destination,
+                                        int64_t length, int64_t *written, const uint8_t *separator,
+                                        int64_t separatorLength, uint32_t flags, int64_t count,
+                                        ...);
+NLSSM_API int64_t NLSStringConcat_WCS4(const NLSSMHandle *handle, NLSString *destination,
+                                       int64_t *length, const uint8_t *separator,
+                                       int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS_WCS4(const NLSSMHandle *handle, uint8_t *destination,
+                                        int64_t length, int64_t *written, const uint8_t *separator,
+                                        int64_t separatorLength, uint32_t flags, int64_t count,
+                                        ...);
+NLSSM_API int64_t NLSStringConcat_MBCS_modal(const NLSSMHandle *handle, NLSString *destination,
+                                             int64_t *length, const uint8_t *separator,
+                                             int64_t separatorLength, uint32_t flags, int64_t count,
+                                             ...);
+NLSSM_API int64_t NLSStringConcatS_MBCS_modal(const NLSSMHandle *handle, uint8_t *destination,
+                                              int64_t length, int64_t *written,
+                                              const uint8_t *separator, int64_t separatorLength,
+                                              uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcat_MBCS(const NLSSMHandle *handle, NLSString *destination,
+                                       int64_t *length, const uint8_t *separator,
+                                       int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS_MBCS(const NLSSMHandle *handle, uint8_t *destination,
+                                        int64_t length, int64_t *written, const uint8_t *separator,
+                                        int64_t separatorLength, uint32_t flags, int64_t count,
+                                        ...);
+
 /* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
 
 /* ---- Number parsing and formatting ---------------------------------------- */

@@ -160,6 +160,27 @@ MoveResult move_text(const NLSSMHandle *h, MoveKind kind, const uint8_t *src, in
   return {};
 }
 
+MoveKind move_kind(const NLSSMHandle *h) {
+  const uint32_t number = h->encodingNumber;
+  switch (h->encodingClass) {
+    case NLSSM_CLASS_SBCS:
+      return MoveKind::kSbcs;
+    case NLSSM_CLASS_UTF8:
+      return MoveKind::kUtf;
+    case NLSSM_CLASS_WCS2:
+      return MoveKind::kWcs2;
+    case NLSSM_CLASS_WCS4:
+      return MoveKind::kWcs4;
+    case NLSSM_CLASS_MBCS_MODAL:
+      return MoveKind::kModal;
+    default:
+      if (number == NLSSM_ENC_EUC_JP) return MoveKind::kEucJp;
+      if (number == 119 || number == 120 || number == 159) return MoveKind::kEucTw;
+      if (number == NLSSM_ENC_GB18030) return MoveKind::kGb18030;
+      return MoveKind::kDbcs;
+  }
+}
+
 namespace {
 
 int64_t move_s(const NLSSMHandle *h, MoveKind kind, const uint8_t *src, int64_t srcLen,

@@ -23,4 +23,7 @@ struct MoveResult {
 MoveResult move_text(const NLSSMHandle *h, MoveKind kind, const uint8_t *src, int64_t srcLen,
                      uint8_t *dst, int64_t dstLen, uint32_t flags, bool wantChars);
 
+// The move rules of the handle's encoding.
+MoveKind move_kind(const NLSSMHandle *h);
+
 }  // namespace nlssm::edit

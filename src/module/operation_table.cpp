@@ -101,6 +101,10 @@ const std::array kRows = {
          same(op(&NLSStringByteLength_MBCS_modal)),
          dbcs(op(&NLSStringByteLength_MBCS_nonmodal), op(&NLSStringByteLength_MBCS_EUC_JP),
               op(&NLSStringByteLength_MBCS_EUC_TW), op(&NLSStringByteLength_MBCS_GB18030))}},
+    Row{43,  // NLSStringConcat
+        {same(op(&NLSStringConcat)), same(op(&NLSStringConcat)), same(op(&NLSStringConcat_WCS2)),
+         same(op(&NLSStringConcat_WCS4)), same(op(&NLSStringConcat_MBCS_modal)),
+         same(op(&NLSStringConcat_MBCS))}},
     Row{44,  // NLSStringFill
         {same(op(&NLSStringFill_SBCS)), same(op(&NLSStringFill_MBCS)),
          same(op(&NLSStringFill_WCS2)), same(op(&NLSStringFill_WCS4)),
@@ -126,6 +130,10 @@ const std::array kRows = {
          dbcs(op(&NLSStringMoveS_MBCS_nonmodal), op(&NLSStringMoveS_MBCS_nonmodal_EUC_JP),
               op(&NLSStringMoveS_MBCS_nonmodal_EUC_TW),
               op(&NLSStringMoveS_MBCS_nonmodal_GB18030))}},
+    Row{66,  // NLSStringConcatS
+        {same(op(&NLSStringConcatS)), same(op(&NLSStringConcatS)), same(op(&NLSStringConcatS_WCS2)),
+         same(op(&NLSStringConcatS_WCS4)), same(op(&NLSStringConcatS_MBCS_modal)),
+         same(op(&NLSStringConcatS_MBCS))}},
     Row{67,  // NLSStringFillS
         {same(op(&NLSStringFillS_SBCS)), same(op(&NLSStringFillS_MBCS)),
          same(op(&NLSStringFillS_WCS2)), same(op(&NLSStringFillS_WCS4)),
