@@ -1182,6 +1182,105 @@ NLSSM_API int64_t NLSStringConcatS_MBCS(const NLSSMHandle *handle, uint8_t *dest
                                         int64_t separatorLength, uint32_t flags, int64_t count,
                                         ...);
 
+/* Justify (slots 47, 71, 113): moves the text between a field's leading and
+ * trailing blanks (whole blank characters of the handle; single-byte and
+ * modal members: the first byte of blankChar, counted in single-byte width
+ * only) to its left ('L'), right ('R') or centre ('C', an odd spare blank to
+ * the right), or leaves it ('N'), in place, blanking the places it left.
+ * The low byte of align is the letter, either case; another letter gives
+ * 0x803fe835 with nothing moved. Results (each may be null): the text's
+ * length and its new start in bytes, and in the C form also in characters.
+ * An empty or all-blank field gives 0 in every result and status 0. The
+ * descriptor form justifies from the buffer's start to length and first
+ * moves a cursor that is not at character 0 there; the S form takes a byte
+ * length, the C form a length in characters (the buffer must hold them); a
+ * negative length is an empty field. NLSStringJustifyC_UTF8 serves UTF-8 and
+ * UTF-EBCDIC, the WCS2 members both byte orders. */
+NLSSM_API int64_t NLSStringJustify(const NLSSMHandle *handle, NLSString *string, uint32_t align,
+                                   int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                    uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                    uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                    int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_UTF8(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustify_UTFE(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_UTFE(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_WCS2(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_WCS2(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_WCS2(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_WCS4(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_WCS4(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_WCS4(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                              uint32_t align, int64_t *textLength,
+                                              int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                               int64_t length, uint32_t align, int64_t *textLength,
+                                               int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                               int64_t length, uint32_t align, int64_t *textBytes,
+                                               int64_t *textChars, int64_t *startBytes,
+                                               int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                                 uint32_t align, int64_t *textLength,
+                                                 int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                  int64_t length, uint32_t align,
+                                                  int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                  int64_t length, uint32_t align,
+                                                  int64_t *textBytes, int64_t *textChars,
+                                                  int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                        NLSString *string, uint32_t align,
+                                                        int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textBytes, int64_t *textChars,
+                                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                        NLSString *string, uint32_t align,
+                                                        int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textBytes, int64_t *textChars,
+                                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                         NLSString *string, uint32_t align,
+                                                         int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                          uint8_t *buffer, int64_t length,
+                                                          uint32_t align, int64_t *textLength,
+                                                          int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                          uint8_t *buffer, int64_t length,
+                                                          uint32_t align, int64_t *textBytes,
+                                                          int64_t *textChars, int64_t *startBytes,
+                                                          int64_t *startChars);
+
 /* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
 
 /* ---- Number parsing and formatting ---------------------------------------- */

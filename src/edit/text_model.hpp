@@ -130,6 +130,23 @@ decltype(auto) with_text(const NLSSMHandle *h, Fn &&fn) {
   }
 }
 
+// Text-model choosers for members: one fixed model, or the model of the
+// handle's encoding within a class (a member that serves several variants).
+template <class T>
+struct FixedText {
+  template <class Fn>
+  static decltype(auto) with(const NLSSMHandle *h, Fn &&fn) {
+    return fn(T(h));
+  }
+};
+template <int kClass>
+struct ClassText {
+  template <class Fn>
+  static decltype(auto) with(const NLSSMHandle *h, Fn &&fn) {
+    return with_text<kClass>(h, fn);
+  }
+};
+
 // The blank as the handle stores it: 1, 2 or 4 bytes.
 struct Blank {
   uint8_t bytes[4];

@@ -110,6 +110,13 @@ const std::array kRows = {
          same(op(&NLSStringFill_WCS2)), same(op(&NLSStringFill_WCS4)),
          same(op(&NLSStringFill_MBCS_modal)), same(op(&NLSStringFill_MBCS))}},
     every_class(45, op(&NLSStringFillLit)),
+    Row{47,  // NLSStringJustify
+        {same(op(&NLSStringJustify)), utf(op(&NLSStringJustify_UTF8), op(&NLSStringJustify_UTFE)),
+         same(op(&NLSStringJustify_WCS2)), same(op(&NLSStringJustify_WCS4)),
+         same(op(&NLSStringJustify_MBCS_modal)),
+         dbcs(op(&NLSStringJustify_MBCS_nonmodal), op(&NLSStringJustify_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringJustify_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringJustify_MBCS_nonmodal_GB18030))}},
     Row{48,  // NLSNumCharsS
         {same(op(&NLSNumCharsS_SBCS)), utf(op(&NLSNumCharsS_UTF8), op(&NLSNumCharsS_UTFE)),
          same(op(&NLSNumCharsS_WCS2)), same(op(&NLSNumCharsS_WCS4)),
@@ -139,6 +146,14 @@ const std::array kRows = {
          same(op(&NLSStringFillS_WCS2)), same(op(&NLSStringFillS_WCS4)),
          same(op(&NLSStringFillS_MBCS_modal)), same(op(&NLSStringFillS_MBCS))}},
     every_class(68, op(&NLSStringFillLitS)),
+    Row{71,  // NLSStringJustifyS
+        {same(op(&NLSStringJustifyS)),
+         utf(op(&NLSStringJustifyS_UTF8), op(&NLSStringJustifyS_UTFE)),
+         same(op(&NLSStringJustifyS_WCS2)), same(op(&NLSStringJustifyS_WCS4)),
+         same(op(&NLSStringJustifyS_MBCS_modal)),
+         dbcs(op(&NLSStringJustifyS_MBCS_nonmodal), op(&NLSStringJustifyS_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringJustifyS_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringJustifyS_MBCS_nonmodal_GB18030))}},
     Row{72,  // NLSStringLength
         {same(op(&NLSStringLength_SBCS)), utf(op(&NLSStringLength_UTF8), op(&NLSStringLength_UTFE)),
          same(op(&NLSStringLength_WCS2)), same(op(&NLSStringLength_WCS4)),
@@ -157,6 +172,13 @@ const std::array kRows = {
          same(op(&NLSStringBLength_MBCS_modal)),
          dbcs(op(&NLSStringBLength_MBCS_nonmodal), op(&NLSStringBLength_MBCS_EUC_JP),
               op(&NLSStringBLength_MBCS_EUC_TW), op(&NLSStringBLength_MBCS_GB18030))}},
+    Row{113,  // NLSStringJustifyC
+        {same(op(&NLSStringJustifyC)), same(op(&NLSStringJustifyC_UTF8)),
+         same(op(&NLSStringJustifyC_WCS2)), same(op(&NLSStringJustifyC_WCS4)),
+         same(op(&NLSStringJustifyC_MBCS_modal)),
+         dbcs(op(&NLSStringJustifyC_MBCS_nonmodal), op(&NLSStringJustifyC_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringJustifyC_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringJustifyC_MBCS_nonmodal_GB18030))}},
     Row{114,  // NLSStringByteLengthC
         {same(op(&NLSStringByteLengthC_SBCS)), same(op(&NLSStringByteLengthC_UTF8)),
          same(op(&NLSStringByteLengthC_WCS2)), same(op(&NLSStringByteLengthC_WCS4)),
