@@ -1281,6 +1281,80 @@ NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal_GB18030(const NLSSMHandle *han
                                                           int64_t *textChars, int64_t *startBytes,
                                                           int64_t *startChars);
 
+/* Add quotes (slots 42, 65): writes the quote character (quoteChar in
+ * quoteWidth bytes; single-byte and modal members: its first byte), the
+ * source with every quote character doubled, and a closing quote. The
+ * descriptor form quotes n characters from the source's curOffset (0 or
+ * more than there are: all; an unset source is empty text) into the
+ * destination's capacity from its buffer's start, and sets the
+ * destination's length to the bytes written. Characters are copied whole; a
+ * quote and its double are written together or not at all; modal runs keep
+ * room for the shift-in that closes them. Done: status 0 and *resultLength
+ * the bytes written. Too little room: 0x803fe807, the destination holds
+ * what fit, and *resultLength is minus the bytes the whole quoted text
+ * needs. Overlapping source and destination are quoted through a work
+ * buffer (2048 bytes on the stack, the handle's pool beyond; a pool that
+ * refuses cuts the room to 2048 bytes). */
+NLSSM_API int64_t NLSStringAddQuotes(const NLSSMHandle *handle, const NLSString *source, int64_t n,
+                                     NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_UTFE(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_UTFE(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_modal(const NLSSMHandle *handle, const NLSString *source,
+                                                int64_t n, NLSString *destination,
+                                                int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                                 int64_t sourceLength, uint8_t *destination,
+                                                 int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                   const NLSString *source, int64_t n,
+                                                   NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                    const uint8_t *source, int64_t sourceLength,
+                                                    uint8_t *destination, int64_t destinationLength,
+                                                    int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                          const NLSString *source, int64_t n,
+                                                          NLSString *destination,
+                                                          int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal_EUC_JP(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                          const NLSString *source, int64_t n,
+                                                          NLSString *destination,
+                                                          int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal_EUC_TW(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                           const NLSString *source, int64_t n,
+                                                           NLSString *destination,
+                                                           int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal_GB18030(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *resultLength);
+
 /* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
 
 /* ---- Number parsing and formatting ---------------------------------------- */

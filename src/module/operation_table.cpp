@@ -101,6 +101,14 @@ const std::array kRows = {
          same(op(&NLSStringByteLength_MBCS_modal)),
          dbcs(op(&NLSStringByteLength_MBCS_nonmodal), op(&NLSStringByteLength_MBCS_EUC_JP),
               op(&NLSStringByteLength_MBCS_EUC_TW), op(&NLSStringByteLength_MBCS_GB18030))}},
+    Row{42,  // NLSStringAddQuotes
+        {same(op(&NLSStringAddQuotes)),
+         utf(op(&NLSStringAddQuotes_UTF8), op(&NLSStringAddQuotes_UTFE)),
+         same(op(&NLSStringAddQuotes_WCS2)), same(op(&NLSStringAddQuotes_WCS4)),
+         same(op(&NLSStringAddQuotes_MBCS_modal)),
+         dbcs(op(&NLSStringAddQuotes_MBCS_nonmodal), op(&NLSStringAddQuotes_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringAddQuotes_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringAddQuotes_MBCS_nonmodal_GB18030))}},
     Row{43,  // NLSStringConcat
         {same(op(&NLSStringConcat)), same(op(&NLSStringConcat)), same(op(&NLSStringConcat_WCS2)),
          same(op(&NLSStringConcat_WCS4)), same(op(&NLSStringConcat_MBCS_modal)),
@@ -137,6 +145,14 @@ const std::array kRows = {
          dbcs(op(&NLSStringMoveS_MBCS_nonmodal), op(&NLSStringMoveS_MBCS_nonmodal_EUC_JP),
               op(&NLSStringMoveS_MBCS_nonmodal_EUC_TW),
               op(&NLSStringMoveS_MBCS_nonmodal_GB18030))}},
+    Row{65,  // NLSStringAddQuotesS
+        {same(op(&NLSStringAddQuotesS)),
+         utf(op(&NLSStringAddQuotesS_UTF8), op(&NLSStringAddQuotesS_UTFE)),
+         same(op(&NLSStringAddQuotesS_WCS2)), same(op(&NLSStringAddQuotesS_WCS4)),
+         same(op(&NLSStringAddQuotesS_MBCS_modal)),
+         dbcs(op(&NLSStringAddQuotesS_MBCS_nonmodal), op(&NLSStringAddQuotesS_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringAddQuotesS_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringAddQuotesS_MBCS_nonmodal_GB18030))}},
     Row{66,  // NLSStringConcatS
         {same(op(&NLSStringConcatS)), same(op(&NLSStringConcatS)), same(op(&NLSStringConcatS_WCS2)),
          same(op(&NLSStringConcatS_WCS4)), same(op(&NLSStringConcatS_MBCS_modal)),
