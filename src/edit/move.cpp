@@ -50,6 +50,7 @@ MoveResult move_chars(const NLSSMHandle *h, const T &text, const uint8_t *src, i
     n = want;  // everything fits: no character can be split
   } else {
     const int64_t limit = std::min(want, room);
+    if (!wantChars) n = text.boundary_before(src, limit);
     while (n < want) {
       const int64_t size = text.item(src + n, want - n, false).size;
       if (n + size > limit) break;

@@ -56,11 +56,26 @@ struct Text {
       return {std::clamp<int64_t>(model.unit(p, remaining, 0).size, 1, remaining), 0};
     }
   }
+  // A character boundary at or before `limit`, near it when the bytes
+  // before it show that no character can run across (no byte within reach
+  // starts a character long enough); 0 when none is found close by.
+  int64_t boundary_before(const uint8_t *p, int64_t limit) const {
+    for (int64_t q = limit; q > 0 && limit - q < 64; --q) {
+      bool clear = true;
+      for (int64_t i = 1; i <= 3 && i <= q && clear; ++i) clear = model.max_size(p[q - i]) <= i;
+      if (clear) return q;
+    }
+    return 0;
+  }
   int64_t shift_length() const {
     if constexpr (kModal) return model.length;
     return 0;
   }
 };
+
+// The variable-width models also answer the most bytes a character that
+// starts with a given byte can take (max_size), which lets a move find a
+// character boundary near the end of its room without walking the text.
 
 // UTF-EBCDIC: the skip table sizes a character; a trailing byte or an
 // unused lead is a character of its own.
@@ -70,12 +85,14 @@ struct UtfeModel : cursor::StatelessModel {
     const int64_t n = cursor::kSkipUtfe[*p];
     return n == 0 || n > remaining ? cursor::Unit{1, n != 0} : cursor::Unit{n, false};
   }
+  int64_t max_size(uint8_t b) const { return std::max<int64_t>(cursor::kSkipUtfe[b], 1); }
 };
 
 // UTF-8 as the edits size it: the lead-length table, a rejected byte or a
 // sequence cut off by the end of the text counting as one byte.
 struct Utf8Model : cursor::Utf8StepModel {
   using Utf8StepModel::Utf8StepModel;
+  int64_t max_size(uint8_t b) const { return std::max<int64_t>(cursor::kUtf8LeadLength[b], 1); }
 };
 
 // Double-byte code pages: a lead byte opens a two-byte character.
@@ -84,10 +101,25 @@ struct DbcsLeadModel : cursor::DbcsModel {
   cursor::Unit unit(const uint8_t *p, int64_t remaining, uint32_t) const {
     return {lead(*p) && remaining >= 2 ? 2 : 1, false};
   }
+  int64_t max_size(uint8_t b) const { return lead(b) ? 2 : 1; }
 };
 
-// Whole units of `width` bytes (SBCS, WCS4) or 16-bit units with surrogate
-// pairs (WCS2).
+struct EucJpEditModel : cursor::EucJpModel {
+  using EucJpModel::EucJpModel;
+  int64_t max_size(uint8_t b) const {
+    return b == 0x8F ? 3 : b == 0x8E || cursor::euc_byte(b) ? 2 : 1;
+  }
+};
+struct EucTwEditModel : cursor::EucTwModel {
+  using EucTwModel::EucTwModel;
+  int64_t max_size(uint8_t b) const { return b == 0x8E ? 4 : cursor::euc_byte(b) ? 2 : 1; }
+};
+struct Gb18030EditModel : cursor::Gb18030Model {
+  using Gb18030Model::Gb18030Model;
+  int64_t max_size(uint8_t b) const { return b >= 0x81 && b <= 0xFE ? 4 : 1; }
+};
+
+// Whole units of `width` bytes (SBCS, WCS4).
 template <int kWidth>
 struct UnitModel : cursor::StatelessModel {
   explicit UnitModel(const NLSSMHandle * = nullptr) {}
@@ -101,9 +133,9 @@ using Wcs2Text = Text<cursor::Wcs2Model<kBig>>;
 using Utf8Text = Text<Utf8Model>;
 using UtfeText = Text<UtfeModel>;
 using DbcsText = Text<DbcsLeadModel>;
-using EucJpText = Text<cursor::EucJpModel>;
-using EucTwText = Text<cursor::EucTwModel>;
-using Gb18030Text = Text<cursor::Gb18030Model>;
+using EucJpText = Text<EucJpEditModel>;
+using EucTwText = Text<EucTwEditModel>;
+using Gb18030Text = Text<Gb18030EditModel>;
 using ModalText = Text<cursor::ModalModel>;
 
 // Calls fn with the text model of the handle's encoding in class kClass

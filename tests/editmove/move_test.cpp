@@ -1,6 +1,7 @@
 // Move through the handle's slots, in every class, with guarded
 // destinations.
 #include <cstring>
+#include <random>
 
 #include "edit_fixture.hpp"
 
@@ -111,6 +112,25 @@ INSTANTIATE_TEST_SUITE_P(
                       Case{135, u"a\u3042\u3044", 4, 3, 2}, Case{134, u"\u3042\uff71", 3, 2, 1},
                       Case{119, u"a\u4e00", 2, 1, 1}, Case{205, u"a\u00a5\u4e00", 6, 5, 2},
                       Case{205, u"\u4e00\u00a5", 5, 2, 1}));
+
+// The raw form finds its cut near the end of the room; the character form
+// walks the whole text. Random bytes, rich in lead bytes, must agree.
+TEST(Move, CutNearTheRoomAgreesWithAFullWalk) {
+  std::mt19937 rng(7);
+  const uint8_t pool[] = {'a',  0x30, 0x8E, 0x8F, 0xA1, 0xA2, 0xC3,
+                          0xE3, 0xF0, 0x81, 0x82, 0x9F, 0xFE, 0x80};
+  for (int enc : {20, 161, 135, 134, 119, 205}) {
+    const NLSSMHandle *h = handle(enc);
+    for (int round = 0; round < 40; ++round) {
+      std::vector<uint8_t> src(90);
+      for (auto &b : src) b = pool[rng() % sizeof pool];
+      for (int64_t room = 0; room <= 90; room += 7) {
+        SCOPED_TRACE(enc);
+        move(h, src, 90, room, 0);  // compares the two forms
+      }
+    }
+  }
+}
 
 TEST(Move, DoubleByteMembersPadWithTheByte20AndStayQuietWhenNothingFits) {
   NLSSMHandle h = *handle(135);
