@@ -161,3 +161,35 @@ TEST(FillLit, ConvertsTheLiteralsFirstCharacter) {
 
 }  // namespace
 }  // namespace editmove_test
+
+namespace editmove_test {
+namespace {
+
+// The converted fill character and separator live in a small stack buffer:
+// a pool that refuses every allocation changes nothing, and nothing stays
+// allocated.
+TEST(FillLit, ConvertedCharactersNeedNoPool) {
+  using ConcatS = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t, int64_t *, const uint8_t *,
+                              int64_t, uint32_t, int64_t, ...);
+  auto &pools = host().pools();
+  for (int enc : {29, 20, 161, 24, 26, 130, 135, 134, 119, 205}) {
+    const NLSSMHandle *h = handle(enc);
+    const auto before = nlssm::refhost::PoolRegistry::counts_of(h->pool);
+    pools.fail_all_allocations(true);
+    uint8_t out[16];
+    int64_t written = 0;
+    const int64_t fill = slot<FillS>(h->NLSStringFillLitS)(
+        h, out, 8, reinterpret_cast<const uint8_t *>("*"), 1, &written);
+    const uint8_t piece[] = {'a', 0, 0, 0};
+    const int64_t join = slot<ConcatS>(h->NLSStringConcatS)(
+        h, out, 16, &written, reinterpret_cast<const uint8_t *>(","), 1, 0, int64_t{2}, piece,
+        int64_t{0}, piece, int64_t{0});
+    pools.fail_all_allocations(false);
+    EXPECT_EQ(fill, 0) << enc;
+    EXPECT_EQ(join, 0) << enc;
+    EXPECT_EQ(nlssm::refhost::PoolRegistry::counts_of(h->pool).allocations, before.allocations);
+  }
+}
+
+}  // namespace
+}  // namespace editmove_test
