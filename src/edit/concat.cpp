@@ -5,8 +5,8 @@
 // a truncation; in terminated mode one zero byte follows the text instead.
 #include <cstdarg>
 
+#include "edit/literal_char.hpp"
 #include "edit/move.hpp"
-#include "module/literal.hpp"
 
 namespace nlssm::edit {
 namespace {
@@ -35,16 +35,9 @@ Target target(uint8_t *dst, int64_t length) {
 template <class NextPiece>
 int64_t concat(const NLSSMHandle *h, const Target &t, int64_t start, const uint8_t *sep,
                int64_t sepLength, uint32_t flags, int64_t count, NextPiece next, int64_t *written) {
-  module::ConvertedLiteral<16> separator;
+  LiteralChar separator;
   if (sep != nullptr && sepLength > 0) {
-    switch (separator.convert(h, sep, 1)) {
-      case module::LiteralOutcome::kNoMemory:
-        return kNoMemory;
-      case module::LiteralOutcome::kFailed:
-        return separator.status();
-      default:
-        break;
-    }
+    if (const int64_t status = convert_first_char(h, separator, sep); status != kOk) return status;
   }
   const MoveKind kind = move_kind(h);
   const int64_t room = t.room;

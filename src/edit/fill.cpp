@@ -2,8 +2,8 @@
 // descriptor forms write from the destination's current character and grow
 // its length; the raw forms fill the buffer from its start. The literal
 // forms convert their character first and call the handle's own fill.
+#include "edit/literal_char.hpp"
 #include "edit/text_model.hpp"
-#include "module/literal.hpp"
 
 namespace nlssm::edit {
 namespace {
@@ -138,19 +138,13 @@ int64_t fill_sbcs(NLSString *dst, int64_t length, const NLSString *fill, int64_t
   return length > room ? kTooSmall : kOk;
 }
 
-// The literal's first character in the handle's encoding.
-using Converted = module::ConvertedLiteral<16>;
-
-int64_t convert_first(const NLSSMHandle *h, Converted &c, const uint8_t *literal, int64_t n) {
+// The literal's first character in the handle's encoding; an empty literal
+// is a caller error.
+int64_t convert_first(const NLSSMHandle *h, LiteralChar &c, const uint8_t *literal, int64_t n) {
   if (literal == nullptr || n <= 0) return kNullArgument;
-  switch (c.convert(h, literal, 1)) {
-    case module::LiteralOutcome::kNoMemory:
-      return kNoMemory;
-    case module::LiteralOutcome::kFailed:
-      return c.status();
-    default:
-      return c.length() > 0 ? kOk : kNullArgument;
-  }
+  const int64_t status = convert_first_char(h, c, literal);
+  if (status != kOk) return status;
+  return c.length() > 0 ? kOk : kNullArgument;
 }
 
 }  // namespace
@@ -160,23 +154,33 @@ namespace e = nlssm::edit;
 
 namespace {
 
-template <int kClass>
+template <class Pick>
 int64_t fill_member(const NLSSMHandle *h, NLSString *destination, int64_t length,
                     const NLSString *fillChar, int64_t *written) {
-  return e::with_text<kClass>(h, [&](const auto &text) {
+  return Pick::with(h, [&](const auto &text) {
     return e::fill_descriptor(h, text, destination, length, fillChar, written);
   });
 }
 
 // Four-byte units cap the fill character at one unit.
-template <int kClass>
+template <class Pick, bool kUnitCap>
 int64_t fill_s_member(const NLSSMHandle *h, uint8_t *destination, int64_t length,
                       const uint8_t *fillChar, int64_t fillLength, int64_t *written) {
-  return e::with_text<kClass>(h, [&](const auto &text) {
-    return e::fill_raw(text, destination, length, fillChar, fillLength,
-                       kClass == NLSSM_CLASS_WCS4 ? 4 : fillLength, written);
+  return Pick::with(h, [&](const auto &text) {
+    return e::fill_raw(text, destination, length, fillChar, fillLength, kUnitCap ? 4 : fillLength,
+                       written);
   });
 }
+
+// The member shared by UTF-8, UTF-EBCDIC and the double-byte non-modal
+// encodings sizes characters by the handle's class.
+struct MultiByteText {
+  template <class Fn>
+  static int64_t with(const NLSSMHandle *h, Fn &&fn) {
+    return h->encodingClass == NLSSM_CLASS_UTF8 ? e::with_text<NLSSM_CLASS_UTF8>(h, fn)
+                                                : e::with_text<NLSSM_CLASS_MBCS_NONMODAL>(h, fn);
+  }
+};
 
 // The literal forms call the handle's own fill with the converted character.
 using FillFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, const NLSString *, int64_t *);
@@ -185,56 +189,39 @@ using FillSFn = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t, const uint8
 
 }  // namespace
 
-extern "C" {
+#define NLSSM_FILL_MEMBERS(SUFFIX, PICK, UNIT_CAP)                                               \
+  extern "C" int64_t NLSStringFill_##SUFFIX(const NLSSMHandle *h, NLSString *destination,        \
+                                            int64_t length, const NLSString *fillChar,           \
+                                            int64_t *written) {                                  \
+    return fill_member<PICK>(h, destination, length, fillChar, written);                         \
+  }                                                                                              \
+  extern "C" int64_t NLSStringFillS_##SUFFIX(const NLSSMHandle *h, uint8_t *destination,         \
+                                             int64_t length, const uint8_t *fillChar,            \
+                                             int64_t fillLength, int64_t *written) {             \
+    return fill_s_member<PICK, UNIT_CAP>(h, destination, length, fillChar, fillLength, written); \
+  }
 
-int64_t NLSStringFill_SBCS(const NLSSMHandle *, NLSString *destination, int64_t length,
-                           const NLSString *fillChar, int64_t *written) {
+// The single-byte descriptor member writes from charIndex (fill_sbcs).
+extern "C" int64_t NLSStringFill_SBCS(const NLSSMHandle *, NLSString *destination, int64_t length,
+                                      const NLSString *fillChar, int64_t *written) {
   return e::fill_sbcs(destination, length, fillChar, written);
 }
-int64_t NLSStringFill_MBCS(const NLSSMHandle *h, NLSString *destination, int64_t length,
-                           const NLSString *fillChar, int64_t *written) {
-  return h->encodingClass == NLSSM_CLASS_UTF8
-             ? fill_member<NLSSM_CLASS_UTF8>(h, destination, length, fillChar, written)
-             : fill_member<NLSSM_CLASS_MBCS_NONMODAL>(h, destination, length, fillChar, written);
+extern "C" int64_t NLSStringFillS_SBCS(const NLSSMHandle *h, uint8_t *destination, int64_t length,
+                                       const uint8_t *fillChar, int64_t fillLength,
+                                       int64_t *written) {
+  return fill_s_member<e::FixedText<e::SbcsText>, false>(h, destination, length, fillChar,
+                                                         fillLength, written);
 }
-int64_t NLSStringFill_WCS2(const NLSSMHandle *h, NLSString *destination, int64_t length,
-                           const NLSString *fillChar, int64_t *written) {
-  return fill_member<NLSSM_CLASS_WCS2>(h, destination, length, fillChar, written);
-}
-int64_t NLSStringFill_WCS4(const NLSSMHandle *h, NLSString *destination, int64_t length,
-                           const NLSString *fillChar, int64_t *written) {
-  return fill_member<NLSSM_CLASS_WCS4>(h, destination, length, fillChar, written);
-}
-int64_t NLSStringFill_MBCS_modal(const NLSSMHandle *h, NLSString *destination, int64_t length,
-                                 const NLSString *fillChar, int64_t *written) {
-  return fill_member<NLSSM_CLASS_MBCS_MODAL>(h, destination, length, fillChar, written);
-}
+NLSSM_FILL_MEMBERS(MBCS, MultiByteText, false)
+NLSSM_FILL_MEMBERS(WCS2, e::ClassText<NLSSM_CLASS_WCS2>, false)
+NLSSM_FILL_MEMBERS(WCS4, e::FixedText<e::Wcs4Text>, true)
+NLSSM_FILL_MEMBERS(MBCS_modal, e::FixedText<e::ModalText>, false)
 
-int64_t NLSStringFillS_SBCS(const NLSSMHandle *h, uint8_t *destination, int64_t length,
-                            const uint8_t *fillChar, int64_t fillLength, int64_t *written) {
-  return fill_s_member<NLSSM_CLASS_SBCS>(h, destination, length, fillChar, fillLength, written);
-}
-int64_t NLSStringFillS_MBCS(const NLSSMHandle *h, uint8_t *destination, int64_t length,
-                            const uint8_t *fillChar, int64_t fillLength, int64_t *written) {
-  return fill_s_member<NLSSM_CLASS_UTF8>(h, destination, length, fillChar, fillLength, written);
-}
-int64_t NLSStringFillS_WCS2(const NLSSMHandle *h, uint8_t *destination, int64_t length,
-                            const uint8_t *fillChar, int64_t fillLength, int64_t *written) {
-  return fill_s_member<NLSSM_CLASS_WCS2>(h, destination, length, fillChar, fillLength, written);
-}
-int64_t NLSStringFillS_WCS4(const NLSSMHandle *h, uint8_t *destination, int64_t length,
-                            const uint8_t *fillChar, int64_t fillLength, int64_t *written) {
-  return fill_s_member<NLSSM_CLASS_WCS4>(h, destination, length, fillChar, fillLength, written);
-}
-int64_t NLSStringFillS_MBCS_modal(const NLSSMHandle *h, uint8_t *destination, int64_t length,
-                                  const uint8_t *fillChar, int64_t fillLength, int64_t *written) {
-  return fill_s_member<NLSSM_CLASS_MBCS_MODAL>(h, destination, length, fillChar, fillLength,
-                                               written);
-}
+extern "C" {
 
 int64_t NLSStringFillLit(const NLSSMHandle *h, NLSString *destination, int64_t length,
                          const uint8_t *literal, int64_t literalLength, int64_t *written) {
-  e::Converted c;
+  e::LiteralChar c;
   if (const int64_t status = e::convert_first(h, c, literal, literalLength); status != 0)
     return status;
   NLSString fill{};
@@ -248,7 +235,7 @@ int64_t NLSStringFillLit(const NLSSMHandle *h, NLSString *destination, int64_t l
 
 int64_t NLSStringFillLitS(const NLSSMHandle *h, uint8_t *destination, int64_t length,
                           const uint8_t *literal, int64_t literalLength, int64_t *written) {
-  e::Converted c;
+  e::LiteralChar c;
   if (const int64_t status = e::convert_first(h, c, literal, literalLength); status != 0)
     return status;
   return reinterpret_cast<FillSFn>(h->NLSStringFillS)(h, destination, length, c.text(),

@@ -1,6 +1,8 @@
 // nlsstr move, fill, concat, justify, quote: the writing edits on a text,
 // through the handle's slots, into a destination of a given room.
+#include <initializer_list>
 #include <iostream>
+#include <utility>
 
 #include "verbs.hpp"
 
@@ -33,18 +35,23 @@ const NLSSMHandle *one_encoding(Session &session, const Arguments &args, const c
   return session.handle(args.words[0]);
 }
 
-// A status is reported, not thrown: a short destination still has a result.
-void report(const std::string &label, int64_t value) {
-  std::cout << label << std::string(label.size() < 11 ? 11 - label.size() : 1, ' ') << value
-            << '\n';
-}
-void report_status(int64_t status) {
+// A status is reported, not thrown: a short destination still has a
+// result. Prints the status, the counts and the text; exit code 1 unless 0.
+int finish(Session &session, const NLSSMHandle *h, const Arguments &args, int64_t status,
+           std::initializer_list<std::pair<const char *, int64_t>> counts,
+           const std::vector<uint8_t> &text) {
   const std::string name = status_name(status);
   std::cout << "status     "
             << (status == 0    ? "0"
                 : name.empty() ? std::to_string(status)
                                : name)
             << '\n';
+  for (const auto &[label, value] : counts) {
+    const std::string l = label;
+    std::cout << l << std::string(l.size() < 11 ? 11 - l.size() : 1, ' ') << value << '\n';
+  }
+  session.print_text(h, text, Session::output_form(args));
+  return status == 0 ? 0 : 1;
 }
 
 int move(Session &session, const Arguments &args) {
@@ -57,11 +64,7 @@ int move(Session &session, const Arguments &args) {
   const int64_t status =
       call<MoveC>(h, h->NLSStringMoveC, text.data(), static_cast<int64_t>(text.size()), dst.data(),
                   room, &bytes, &chars, static_cast<uint32_t>(number(args, "flags", 0)));
-  report_status(status);
-  report("bytes", bytes);
-  report("characters", chars);
-  session.print_text(h, dst, Session::output_form(args));
-  return status == 0 ? 0 : 1;
+  return finish(session, h, args, status, {{"bytes", bytes}, {"characters", chars}}, dst);
 }
 
 int fill(Session &session, const Arguments &args) {
@@ -74,11 +77,8 @@ int fill(Session &session, const Arguments &args) {
   const int64_t status = call<FillLitS>(h, h->NLSStringFillLitS, dst.data(), room,
                                         reinterpret_cast<const uint8_t *>(ch.data()),
                                         static_cast<int64_t>(ch.size()), &written);
-  report_status(status);
-  report("bytes", written);
   dst.resize(static_cast<size_t>(std::max<int64_t>(written, 0)));
-  session.print_text(h, dst, Session::output_form(args));
-  return status == 0 ? 0 : 1;
+  return finish(session, h, args, status, {{"bytes", written}}, dst);
 }
 
 // Pieces are the words after the encoding (UTF-8, converted); up to eight.
@@ -105,11 +105,8 @@ int concat(Session &session, const Arguments &args) {
       static_cast<uint32_t>(number(args, "flags", 0)), static_cast<int64_t>(args.words.size() - 1),
       piece(0), size(0), piece(1), size(1), piece(2), size(2), piece(3), size(3), piece(4), size(4),
       piece(5), size(5), piece(6), size(6), piece(7), size(7));
-  report_status(status);
-  report("bytes", written);
   if (length < 0) dst.resize(static_cast<size_t>(written));  // the text before its zero byte
-  session.print_text(h, dst, Session::output_form(args));
-  return status == 0 ? 0 : 1;
+  return finish(session, h, args, status, {{"bytes", written}}, dst);
 }
 
 int justify(Session &session, const Arguments &args) {
@@ -125,13 +122,12 @@ int justify(Session &session, const Arguments &args) {
       call<JustifyC>(h, h->NLSStringJustifyC, field.data(), chars,
                      static_cast<uint32_t>(static_cast<uint8_t>(align.empty() ? 0 : align[0])),
                      &bytes, &textChars, &start, &startChars);
-  report_status(status);
-  report("text bytes", bytes);
-  report("text chars", textChars);
-  report("start", start);
-  report("start char", startChars);
-  session.print_text(h, field, Session::output_form(args));
-  return status == 0 ? 0 : 1;
+  return finish(session, h, args, status,
+                {{"text bytes", bytes},
+                 {"text chars", textChars},
+                 {"start", start},
+                 {"start char", startChars}},
+                field);
 }
 
 int quote(Session &session, const Arguments &args) {
@@ -145,11 +141,8 @@ int quote(Session &session, const Arguments &args) {
   const int64_t status =
       call<AddQuotesS>(h, h->NLSStringAddQuotesS, text.data(), static_cast<int64_t>(text.size()),
                        dst.data(), room, &result);
-  report_status(status);
-  report("length", result);
   if (result >= 0) dst.resize(static_cast<size_t>(result));
-  session.print_text(h, dst, Session::output_form(args));
-  return status == 0 ? 0 : 1;
+  return finish(session, h, args, status, {{"length", result}}, dst);
 }
 
 const RegisterVerb kMove{{"move", "ENCODING [--room BYTES] [--flags 0x1|0x200]",
