@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -65,6 +66,30 @@ inline std::vector<uint8_t> blanks(const NLSSMHandle *h, int64_t n) {
 inline std::vector<uint8_t> cat(std::vector<uint8_t> a, const std::vector<uint8_t> &b) {
   a.insert(a.end(), b.begin(), b.end());
   return a;
+}
+
+// What an edit answered: its status, a count it stored, the bytes it left.
+struct Result {
+  int64_t status, count;
+  std::vector<uint8_t> out;
+  bool operator==(const Result &) const = default;
+};
+inline void PrintTo(const Result &r, std::ostream *os) {
+  *os << std::hex << r.status << std::dec << " count " << r.count << " out "
+      << ::testing::PrintToString(r.out);
+}
+constexpr int64_t kShort = NLSSM_E_DEST_TOO_SMALL;
+
+// A descriptor over `p` whose current character is at byte `at`.
+inline NLSString over(uint8_t *p, int64_t length, int64_t capacity, int64_t at) {
+  NLSString s{};
+  s.buffer = p;
+  s.length = static_cast<uint64_t>(length);
+  s.capacity = static_cast<uint64_t>(capacity);
+  s.charIndex = s.curOffset = at;
+  s.nextOffset = NLSSM_POS_NONE;
+  s.prevOffset = NLSSM_POS_NO_PREVIOUS;
+  return s;
 }
 
 // Text in a handle's encoding, by the host's converter of that encoding.

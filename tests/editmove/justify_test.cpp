@@ -1,4 +1,6 @@
 // Justify through the handle's slots, in every class.
+#include <ostream>
+
 #include "edit_fixture.hpp"
 
 namespace editmove_test {
@@ -19,7 +21,12 @@ std::vector<uint8_t> field(int enc, int lead, const std::u16string &text, int tr
 struct Out {
   int64_t status, length, start;
   std::vector<uint8_t> text;
+  bool operator==(const Out &) const = default;
 };
+void PrintTo(const Out &o, std::ostream *os) {
+  *os << std::hex << o.status << std::dec << " length " << o.length << " start " << o.start
+      << " text " << ::testing::PrintToString(o.text);
+}
 
 Out justify_s(const NLSSMHandle *h, std::vector<uint8_t> f, uint32_t align) {
   Out o{0, -1, -1, {}};
@@ -43,22 +50,15 @@ TEST_P(Justification, MovesTheTextAndBlanksWhatItLeft) {
     int lead, trail;  // the result
   } cases[] = {{'C', 2, 3}, {'c', 2, 3}, {'L', 0, 5}, {'r', 5, 0}, {'N', 1, 4}};
   for (const auto &c : cases) {
-    const Out o = justify_s(h, field(enc, 1, text, 4), c.align);
-    EXPECT_EQ(o.status, 0) << enc << char(c.align);
-    EXPECT_EQ(o.text, field(enc, c.lead, text, c.trail)) << enc << char(c.align);
-    EXPECT_EQ(o.length, t);
-    EXPECT_EQ(o.start, c.lead * bw);
+    EXPECT_EQ(justify_s(h, field(enc, 1, text, 4), c.align),
+              (Out{0, t, c.lead * bw, field(enc, c.lead, text, c.trail)}))
+        << char(c.align);
   }
   // A letter that is not an alignment moves nothing but still measures.
-  Out o = justify_s(h, field(enc, 1, text, 4), 'x' | 0x4300);
-  EXPECT_EQ(o.status, NLSSM_E_BAD_ALIGNMENT);
-  EXPECT_EQ(o.text, field(enc, 1, text, 4));
-  EXPECT_EQ(o.length, t);
-  EXPECT_EQ(o.start, bw);
-  // All blank, or nothing: zeros, whatever the letter.
-  o = justify_s(h, field(enc, 3, u"", 0), 'x');
-  EXPECT_EQ(o.status, 0);
-  EXPECT_EQ(o.length + o.start, 0);
+  EXPECT_EQ(justify_s(h, field(enc, 1, text, 4), 'x' | 0x4300),
+            (Out{NLSSM_E_BAD_ALIGNMENT, t, bw, field(enc, 1, text, 4)}));
+  // All blank: zeros, whatever the letter.
+  EXPECT_EQ(justify_s(h, field(enc, 3, u"", 0), 'x'), (Out{0, 0, 0, field(enc, 3, u"", 0)}));
   // The character form counts characters.
   std::vector<uint8_t> f = field(enc, 3, text, 2);
   int64_t bytes = 0, chars = 0, start = 0, startChars = 0;
@@ -92,11 +92,7 @@ TEST(Justify, ModalRunsMoveWholeWithTheirShifts) {
 TEST(Justify, DescriptorFormStartsFromTheFirstCharacter) {
   const NLSSMHandle *h = handle(29);
   std::vector<uint8_t> f = bytes("  ab  ##");
-  NLSString s{};
-  s.buffer = f.data();
-  s.length = 6;
-  s.capacity = 8;
-  s.charIndex = s.curOffset = 3;
+  NLSString s = over(f.data(), 6, 8, 3);
   int64_t length = 0, start = 0;
   EXPECT_EQ(slot<Justify>(h->NLSStringJustify)(h, &s, 'L', &length, &start), 0);
   EXPECT_EQ(f, bytes("ab    ##"));

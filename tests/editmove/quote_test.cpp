@@ -11,17 +11,14 @@ using AddQuotesS = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, ui
 using AddQuotes = int64_t (*)(const NLSSMHandle *, const NLSString *, int64_t, NLSString *,
                               int64_t *);
 
-struct Out {
-  int64_t status, result;
-  std::vector<uint8_t> text;
-};
-
-Out quote(const NLSSMHandle *h, const std::vector<uint8_t> &src, int64_t room) {
+// Quotes into a guarded room; the text is what the result counts, or the
+// whole room when it is negative.
+Result quote(const NLSSMHandle *h, const std::vector<uint8_t> &src, int64_t room) {
   Guarded dst(room);
-  Out o{0, 0, {}};
+  Result o{};
   o.status = slot<AddQuotesS>(h->NLSStringAddQuotesS)(
-      h, src.data(), static_cast<int64_t>(src.size()), dst.data(), room, &o.result);
-  o.text = dst.text(o.result > 0 ? o.result : room);
+      h, src.data(), static_cast<int64_t>(src.size()), dst.data(), room, &o.count);
+  o.out = dst.text(o.count > 0 ? o.count : room);
   EXPECT_TRUE(dst.intact());
   return o;
 }
@@ -33,25 +30,16 @@ TEST_P(Quoting, DoublesQuotesAndReportsTheLengthNeeded) {
   const NLSSMHandle *h = handle(enc);
   const int64_t q = static_cast<int64_t>(encode(enc, u"\"").size());
   const std::vector<uint8_t> src = encode(enc, u"a\"b");
-  Out o = quote(h, src, 6 * q);
-  EXPECT_EQ(o.status, 0) << enc;
-  EXPECT_EQ(o.result, 6 * q);
-  EXPECT_EQ(o.text, encode(enc, u"\"a\"\"b\""));
-  o = quote(h, src, 4 * q);
-  EXPECT_EQ(o.status, NLSSM_E_DEST_TOO_SMALL);
-  EXPECT_EQ(o.result, -6 * q);
-  EXPECT_EQ(o.text, encode(enc, u"\"a\"\""));
+  EXPECT_EQ(quote(h, src, 6 * q), (Result{0, 6 * q, encode(enc, u"\"a\"\"b\"")}));
+  EXPECT_EQ(quote(h, src, 4 * q), (Result{kShort, -6 * q, encode(enc, u"\"a\"\"")}));
   // A quote and its double go together: no lone quote ends the text.
-  o = quote(h, src, 3 * q);
-  EXPECT_EQ(o.result, -6 * q);
-  EXPECT_EQ(o.text, cat(encode(enc, u"\"a"), std::vector<uint8_t>(q, 0xAA)));
+  EXPECT_EQ(quote(h, src, 3 * q),
+            (Result{kShort, -6 * q, cat(encode(enc, u"\"a"), std::vector<uint8_t>(q, 0xAA))}));
   // Whole characters only.
-  const std::vector<uint8_t> wide = encode(enc, u"\u00e9\u4e00");
-  const int64_t first = static_cast<int64_t>(encode(enc, u"\u00e9").size());
-  o = quote(h, wide, q + first + 1);
-  EXPECT_EQ(o.status, NLSSM_E_DEST_TOO_SMALL);
-  EXPECT_EQ(o.result, -(2 * q + static_cast<int64_t>(wide.size())));
-  EXPECT_EQ(o.text, cat(cat(encode(enc, u"\""), encode(enc, u"\u00e9")), {0xAA}));
+  const std::vector<uint8_t> wide = encode(enc, u"\u00e9\u4e00"), e = encode(enc, u"\u00e9");
+  const auto n = static_cast<int64_t>(e.size());
+  EXPECT_EQ(quote(h, wide, q + n + 1), (Result{kShort, -(2 * q + static_cast<int64_t>(wide.size())),
+                                               cat(cat(encode(enc, u"\""), e), {0xAA})}));
 }
 
 INSTANTIATE_TEST_SUITE_P(Encodings, Quoting,
@@ -60,30 +48,21 @@ INSTANTIATE_TEST_SUITE_P(Encodings, Quoting,
 TEST(AddQuotes, SingleByteAndModalTextUseTheQuoteByte) {
   for (int enc : {29, 78, 130}) {
     const NLSSMHandle *h = handle(enc);
-    const Out o = quote(h, encode(enc, u"a\"b"), 6);
-    EXPECT_EQ(o.text, encode(enc, u"\"a\"\"b\"")) << enc;
+    EXPECT_EQ(quote(h, encode(enc, u"a\"b"), 6).out, encode(enc, u"\"a\"\"b\"")) << enc;
   }
   // A modal run cut short is closed with a shift-in; an empty one goes.
   const NLSSMHandle *h = handle(130);
   const std::vector<uint8_t> run = {'x', 0x0E, 0x42, 0xC1, 0x42, 0xC2, 0x0F};
-  Out o = quote(h, run, 7);
-  EXPECT_EQ(o.result, -9);
-  EXPECT_EQ(o.text, (std::vector<uint8_t>{0x7F, 'x', 0x0E, 0x42, 0xC1, 0x0F, 0xAA}));
-  o = quote(h, run, 4);
-  EXPECT_EQ(o.text, (std::vector<uint8_t>{0x7F, 'x', 0xAA, 0xAA}));
+  EXPECT_EQ(quote(h, run, 7), (Result{kShort, -9, {0x7F, 'x', 0x0E, 0x42, 0xC1, 0x0F, 0xAA}}));
+  EXPECT_EQ(quote(h, run, 4), (Result{kShort, -9, {0x7F, 'x', 0xAA, 0xAA}}));
 }
 
 TEST(AddQuotes, DescriptorFormQuotesCharactersFromTheCursor) {
   const NLSSMHandle *h = handle(20);
   std::vector<uint8_t> src = encode(20, u"xa\u00e9\"z");
-  NLSString s{};
-  s.buffer = src.data();
-  s.length = src.size();
-  s.curOffset = s.charIndex = 1;
+  NLSString s = over(src.data(), static_cast<int64_t>(src.size()), 0, 1);
   Guarded dst(16);
-  NLSString d{};
-  d.buffer = dst.data();
-  d.capacity = 16;
+  NLSString d = over(dst.data(), 0, 16, 0);
   int64_t result = 0;
   EXPECT_EQ(slot<AddQuotes>(h->NLSStringAddQuotes)(h, &s, 3, &d, &result), 0);
   EXPECT_EQ(result, 7);
