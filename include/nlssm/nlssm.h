@@ -1362,6 +1362,373 @@ NLSSM_API int64_t NLSStringLike_MBCS_nonmodal2_EBCDIC(const NLSSMHandle *handle,
 /* ---- Substring, delete, reverse and strip --------------------------------- */
 
 /* ---- Move, fill, concatenate, justify and add quotes ---------------------- */
+/* Move (slots 63, 115): copies sourceLength bytes of source (characters
+ * with flag NLSSM_EDIT_SOURCE_IN_CHARS; the fixed-width members count units,
+ * the others whole characters, which the source must hold) into the
+ * destinationLength bytes at destination, in whole characters. Too little
+ * room: what fits is copied, 0x803fe807, no padding. Otherwise flag
+ * NLSSM_EDIT_PAD blank-pads the rest of the room. Source and destination may
+ * overlap. The double-byte non-modal members pad with the byte 0x20 and
+ * report 0x803fe807 only when something was copied. The modal member keeps
+ * shift sequences balanced: a leading shift-in and a trailing shift-out are
+ * dropped, a copy ending in a double-byte run is closed with a shift-in
+ * (double-byte characters are given back to make room for it, with
+ * 0x803fe807); the same buffer as source and destination, without padding
+ * and ending in single-byte width, is only measured. The UTF-8 member sizes
+ * UTF-EBCDIC text by its own rule. Counts (may be null): bytes written,
+ * padding excluded; characters written (units for the fixed-width members).
+ * Null buffers with a non-zero length: 0x803fe82a. */
+NLSSM_API int64_t NLSStringMoveS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *bytesWritten,
+                                           uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *bytesWritten,
+                                           int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceLength, uint8_t *destination,
+                                            int64_t destinationLength, int64_t *bytesWritten,
+                                            uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceLength, uint8_t *destination,
+                                            int64_t destinationLength, int64_t *bytesWritten,
+                                            int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, uint8_t *destination,
+                                               int64_t destinationLength, int64_t *bytesWritten,
+                                               uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, uint8_t *destination,
+                                               int64_t destinationLength, int64_t *bytesWritten,
+                                               int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                      const uint8_t *source, int64_t sourceLength,
+                                                      uint8_t *destination,
+                                                      int64_t destinationLength,
+                                                      int64_t *bytesWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal_EUC_JP(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *bytesWritten, int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                      const uint8_t *source, int64_t sourceLength,
+                                                      uint8_t *destination,
+                                                      int64_t destinationLength,
+                                                      int64_t *bytesWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal_EUC_TW(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *bytesWritten, int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                       const uint8_t *source, int64_t sourceLength,
+                                                       uint8_t *destination,
+                                                       int64_t destinationLength,
+                                                       int64_t *bytesWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal_GB18030(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *bytesWritten, int64_t *charsWritten, uint32_t flags);
+
+/* Fill (slots 44, 67, 45, 68): repeats one character, in whole characters.
+ * Descriptor forms take the character at fillChar's curOffset (an unset
+ * fillChar: nothing is done, 0) and count `written` in characters. The SBCS
+ * member writes from the byte offset charIndex: length bytes (0 = all the
+ * room up to capacity; more than the room fills the room, 0x803fe807). The
+ * others write from curOffset (the end of the text when unset): lengths of
+ * at least one character give the smaller of the characters asked and the
+ * characters that fit (0x803fe807 when fewer than asked); shorter lengths,
+ * 0 included, fill all whole characters of the room (0x803fe807 when bytes
+ * are left over). The modal member writes a double-byte character as a
+ * shift-out, the characters and a shift-in (whose bytes count in length
+ * and room). The destination's length grows to the end of the fill.
+ * Raw forms repeat the whole fillChar buffer (modal: its first character;
+ * four-byte units: at most 4 bytes) over length bytes from the start,
+ * `written` in bytes; 0x803fe807 when bytes are left over; a fill character
+ * of length 0 is 0x803fe82a. Literal forms convert the literal's first byte
+ * (encoding 62) through charConverter and call the handle's NLSStringFill
+ * or NLSStringFillS; an empty literal is 0x803fe82a. */
+NLSSM_API int64_t NLSStringFill_SBCS(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_SBCS(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_MBCS(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_MBCS(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_WCS2(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_WCS2(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_WCS4(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_WCS4(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_MBCS_modal(const NLSSMHandle *handle, NLSString *destination,
+                                           int64_t length, const NLSString *fillChar,
+                                           int64_t *written);
+NLSSM_API int64_t NLSStringFillS_MBCS_modal(const NLSSMHandle *handle, uint8_t *destination,
+                                            int64_t length, const uint8_t *fillChar,
+                                            int64_t fillLength, int64_t *written);
+NLSSM_API int64_t NLSStringFillLit(const NLSSMHandle *handle, NLSString *destination,
+                                   int64_t length, const uint8_t *literal, int64_t literalLength,
+                                   int64_t *written);
+NLSSM_API int64_t NLSStringFillLitS(const NLSSMHandle *handle, uint8_t *destination, int64_t length,
+                                    const uint8_t *literal, int64_t literalLength,
+                                    int64_t *written);
+
+/* Concatenate (slots 43, 66): joins `count` pieces (variable arguments:
+ * NLSString pointers for the descriptor forms, from each one's curOffset to
+ * its length, a null or unset one ending the list; (const uint8_t *, int64_t
+ * bytes) pairs for the raw forms) into the destination, with the separator
+ * literal's first byte (encoding 62, converted through charConverter) between
+ * pieces when separatorLength is not 0. Room: *length (descriptor forms; 0 =
+ * up to capacity) or length bytes; a negative length is terminated mode,
+ * room -length - 1 and a zero byte after the text instead of blank padding.
+ * The descriptor forms never write past capacity and write from the byte
+ * offset charIndex (NLSStringConcat, single-byte and UTF-8) or from curOffset
+ * (the others; negative counts as 0). A piece longer than the room left
+ * ends the join with 0x803fe807 after copying what fits in whole characters,
+ * or nothing of it with flag NLSSM_EDIT_PAD; a separator taking the last
+ * byte of room before a piece also gives 0x803fe807. The rest of the room is
+ * blank-filled in normal mode, truncated or not. Modal pieces are moved as
+ * by the modal move (each left in single-byte width), and a destination whose
+ * text ends in a double-byte run at the write offset gets a shift-in first.
+ * The bytes written (separators included, padding excluded) go to *length or
+ * *written (may be null); the descriptor's length becomes the end of the text. */
+NLSSM_API int64_t NLSStringConcat(const NLSSMHandle *handle, NLSString *destination,
+                                  int64_t *length, const uint8_t *separator,
+                                  int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS(const NLSSMHandle *handle, uint8_t *destination, int64_t length,
+                                   int64_t *written, const uint8_t *separator,
+                                   int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcat_WCS2(const NLSSMHandle *handle, NLSString *destination,
+                                       int64_t *length, const uint8_t *separator,
+                                       int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS_WCS2(const NLSSMHandle *handle, uint8_t *destination,
+                                        int64_t length, int64_t *written, const uint8_t *separator,
+                                        int64_t separatorLength, uint32_t flags, int64_t count,
+                                        ...);
+NLSSM_API int64_t NLSStringConcat_WCS4(const NLSSMHandle *handle, NLSString *destination,
+                                       int64_t *length, const uint8_t *separator,
+                                       int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS_WCS4(const NLSSMHandle *handle, uint8_t *destination,
+                                        int64_t length, int64_t *written, const uint8_t *separator,
+                                        int64_t separatorLength, uint32_t flags, int64_t count,
+                                        ...);
+NLSSM_API int64_t NLSStringConcat_MBCS_modal(const NLSSMHandle *handle, NLSString *destination,
+                                             int64_t *length, const uint8_t *separator,
+                                             int64_t separatorLength, uint32_t flags, int64_t count,
+                                             ...);
+NLSSM_API int64_t NLSStringConcatS_MBCS_modal(const NLSSMHandle *handle, uint8_t *destination,
+                                              int64_t length, int64_t *written,
+                                              const uint8_t *separator, int64_t separatorLength,
+                                              uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcat_MBCS(const NLSSMHandle *handle, NLSString *destination,
+                                       int64_t *length, const uint8_t *separator,
+                                       int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS_MBCS(const NLSSMHandle *handle, uint8_t *destination,
+                                        int64_t length, int64_t *written, const uint8_t *separator,
+                                        int64_t separatorLength, uint32_t flags, int64_t count,
+                                        ...);
+
+/* Justify (slots 47, 71, 113): moves the text between a field's leading and
+ * trailing blanks (whole blank characters of the handle; single-byte and
+ * modal members: the first byte of blankChar, counted in single-byte width
+ * only) to its left ('L'), right ('R') or centre ('C', an odd spare blank to
+ * the right), or leaves it ('N'), in place, blanking the places it left.
+ * The low byte of align is the letter, either case; another letter gives
+ * 0x803fe835 with nothing moved. Results (each may be null): the text's
+ * length and its new start in bytes, and in the C form also in characters.
+ * An empty or all-blank field gives 0 in every result and status 0. The
+ * descriptor form justifies from the buffer's start to length and first
+ * moves a cursor that is not at character 0 there; the S form takes a byte
+ * length, the C form a length in characters (the buffer must hold them); a
+ * negative length is an empty field. NLSStringJustifyC_UTF8 serves UTF-8 and
+ * UTF-EBCDIC, the WCS2 members both byte orders. */
+NLSSM_API int64_t NLSStringJustify(const NLSSMHandle *handle, NLSString *string, uint32_t align,
+                                   int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                    uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                    uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                    int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_UTF8(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustify_UTFE(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_UTFE(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_WCS2(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_WCS2(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_WCS2(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_WCS4(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_WCS4(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_WCS4(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                              uint32_t align, int64_t *textLength,
+                                              int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                               int64_t length, uint32_t align, int64_t *textLength,
+                                               int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                               int64_t length, uint32_t align, int64_t *textBytes,
+                                               int64_t *textChars, int64_t *startBytes,
+                                               int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                                 uint32_t align, int64_t *textLength,
+                                                 int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                  int64_t length, uint32_t align,
+                                                  int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                  int64_t length, uint32_t align,
+                                                  int64_t *textBytes, int64_t *textChars,
+                                                  int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                        NLSString *string, uint32_t align,
+                                                        int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textBytes, int64_t *textChars,
+                                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                        NLSString *string, uint32_t align,
+                                                        int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textBytes, int64_t *textChars,
+                                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                         NLSString *string, uint32_t align,
+                                                         int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                          uint8_t *buffer, int64_t length,
+                                                          uint32_t align, int64_t *textLength,
+                                                          int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                          uint8_t *buffer, int64_t length,
+                                                          uint32_t align, int64_t *textBytes,
+                                                          int64_t *textChars, int64_t *startBytes,
+                                                          int64_t *startChars);
+
+/* Add quotes (slots 42, 65): writes the quote character (quoteChar in
+ * quoteWidth bytes; single-byte and modal members: its first byte), the
+ * source with every quote character doubled, and a closing quote. The
+ * descriptor form quotes n characters from the source's curOffset (0 or
+ * more than there are: all; an unset source is empty text) into the
+ * destination's capacity from its buffer's start, and sets the
+ * destination's length to the bytes written. Characters are copied whole; a
+ * quote and its double are written together or not at all; modal runs keep
+ * room for the shift-in that closes them. Done: status 0 and *resultLength
+ * the bytes written. Too little room: 0x803fe807, the destination holds
+ * what fit, and *resultLength is minus the bytes the whole quoted text
+ * needs. Overlapping source and destination are quoted through a work
+ * buffer (2048 bytes on the stack, the handle's pool beyond; a pool that
+ * refuses cuts the room to 2048 bytes). */
+NLSSM_API int64_t NLSStringAddQuotes(const NLSSMHandle *handle, const NLSString *source, int64_t n,
+                                     NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_UTFE(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_UTFE(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_modal(const NLSSMHandle *handle, const NLSString *source,
+                                                int64_t n, NLSString *destination,
+                                                int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                                 int64_t sourceLength, uint8_t *destination,
+                                                 int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                   const NLSString *source, int64_t n,
+                                                   NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                    const uint8_t *source, int64_t sourceLength,
+                                                    uint8_t *destination, int64_t destinationLength,
+                                                    int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                          const NLSString *source, int64_t n,
+                                                          NLSString *destination,
+                                                          int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal_EUC_JP(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                          const NLSString *source, int64_t n,
+                                                          NLSString *destination,
+                                                          int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal_EUC_TW(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                           const NLSString *source, int64_t n,
+                                                           NLSString *destination,
+                                                           int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal_GB18030(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *resultLength);
 
 /* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
 /* Four copying edits: each reads a source and writes the result into a

@@ -151,12 +151,36 @@ const std::array kRows = {
          same(op(&NLSStringByteLength_MBCS_modal)),
          dbcs(op(&NLSStringByteLength_MBCS_nonmodal), op(&NLSStringByteLength_MBCS_EUC_JP),
               op(&NLSStringByteLength_MBCS_EUC_TW), op(&NLSStringByteLength_MBCS_GB18030))}},
+    Row{42,  // NLSStringAddQuotes
+        {same(op(&NLSStringAddQuotes)),
+         utf(op(&NLSStringAddQuotes_UTF8), op(&NLSStringAddQuotes_UTFE)),
+         same(op(&NLSStringAddQuotes_WCS2)), same(op(&NLSStringAddQuotes_WCS4)),
+         same(op(&NLSStringAddQuotes_MBCS_modal)),
+         dbcs(op(&NLSStringAddQuotes_MBCS_nonmodal), op(&NLSStringAddQuotes_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringAddQuotes_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringAddQuotes_MBCS_nonmodal_GB18030))}},
+    Row{43,  // NLSStringConcat
+        {same(op(&NLSStringConcat)), same(op(&NLSStringConcat)), same(op(&NLSStringConcat_WCS2)),
+         same(op(&NLSStringConcat_WCS4)), same(op(&NLSStringConcat_MBCS_modal)),
+         same(op(&NLSStringConcat_MBCS))}},
+    Row{44,  // NLSStringFill
+        {same(op(&NLSStringFill_SBCS)), same(op(&NLSStringFill_MBCS)),
+         same(op(&NLSStringFill_WCS2)), same(op(&NLSStringFill_WCS4)),
+         same(op(&NLSStringFill_MBCS_modal)), same(op(&NLSStringFill_MBCS))}},
+    every_class(45, op(&NLSStringFillLit)),
     Row{46,  // NLSStringFindCharLit
         {same(op(&NLSStringFindCharLit_SBCS)), same(op(&NLSStringFindCharLit_UTF8)),
          same(op(&NLSStringFindCharLit_WCS2)), same(op(&NLSStringFindCharLit_WCS4)),
          same(op(&NLSStringFindCharLit_MBCS_modal)),
          dbcs(op(&NLSStringFindCharLit_MBCS_nonmodal), op(&NLSStringFindCharLit_MBCS_EUC_JP),
               op(&NLSStringFindCharLit_MBCS_EUC_TW), op(&NLSStringFindCharLit_MBCS_GB18030))}},
+    Row{47,  // NLSStringJustify
+        {same(op(&NLSStringJustify)), utf(op(&NLSStringJustify_UTF8), op(&NLSStringJustify_UTFE)),
+         same(op(&NLSStringJustify_WCS2)), same(op(&NLSStringJustify_WCS4)),
+         same(op(&NLSStringJustify_MBCS_modal)),
+         dbcs(op(&NLSStringJustify_MBCS_nonmodal), op(&NLSStringJustify_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringJustify_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringJustify_MBCS_nonmodal_GB18030))}},
     Row{48,  // NLSNumCharsS
         {same(op(&NLSNumCharsS_SBCS)), utf(op(&NLSNumCharsS_UTF8), op(&NLSNumCharsS_UTFE)),
          same(op(&NLSNumCharsS_WCS2)), same(op(&NLSNumCharsS_WCS4)),
@@ -177,6 +201,30 @@ const std::array kRows = {
          dbcs(op(&NLSStringIndexS_MBCS_nonmodal), op(&NLSStringIndexS_MBCS_nonmodal_EUC_JP),
               op(&NLSStringIndexS_MBCS_nonmodal_EUC_TW),
               op(&NLSStringIndexS_MBCS_nonmodal_GB18030))}},
+    Row{63,  // NLSStringMoveS
+        {same(op(&NLSStringMoveS_SBCS)), same(op(&NLSStringMoveS_MBCS_UTF8)),
+         same(op(&NLSStringMoveS_WCS2)), same(op(&NLSStringMoveS_WCS4)),
+         same(op(&NLSStringMoveS_MBCS_modal)),
+         dbcs(op(&NLSStringMoveS_MBCS_nonmodal), op(&NLSStringMoveS_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringMoveS_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringMoveS_MBCS_nonmodal_GB18030))}},
+    Row{65,  // NLSStringAddQuotesS
+        {same(op(&NLSStringAddQuotesS)),
+         utf(op(&NLSStringAddQuotesS_UTF8), op(&NLSStringAddQuotesS_UTFE)),
+         same(op(&NLSStringAddQuotesS_WCS2)), same(op(&NLSStringAddQuotesS_WCS4)),
+         same(op(&NLSStringAddQuotesS_MBCS_modal)),
+         dbcs(op(&NLSStringAddQuotesS_MBCS_nonmodal), op(&NLSStringAddQuotesS_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringAddQuotesS_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringAddQuotesS_MBCS_nonmodal_GB18030))}},
+    Row{66,  // NLSStringConcatS
+        {same(op(&NLSStringConcatS)), same(op(&NLSStringConcatS)), same(op(&NLSStringConcatS_WCS2)),
+         same(op(&NLSStringConcatS_WCS4)), same(op(&NLSStringConcatS_MBCS_modal)),
+         same(op(&NLSStringConcatS_MBCS))}},
+    Row{67,  // NLSStringFillS
+        {same(op(&NLSStringFillS_SBCS)), same(op(&NLSStringFillS_MBCS)),
+         same(op(&NLSStringFillS_WCS2)), same(op(&NLSStringFillS_WCS4)),
+         same(op(&NLSStringFillS_MBCS_modal)), same(op(&NLSStringFillS_MBCS))}},
+    every_class(68, op(&NLSStringFillLitS)),
     Row{69,  // NLSStringFindCharLitS
         {same(op(&NLSStringFindCharLitS_SBCS)), same(op(&NLSStringFindCharLitS_UTF8)),
          same(op(&NLSStringFindCharLitS_WCS2)), same(op(&NLSStringFindCharLitS_WCS4)),
@@ -189,6 +237,14 @@ const std::array kRows = {
          same(op(&NLSStringFindCharS_MBCS_modal)),
          dbcs(op(&NLSStringFindCharLitS_MBCS_nonmodal), op(&NLSStringFindCharLitS_MBCS_EUC_JP),
               op(&NLSStringFindCharLitS_MBCS_EUC_TW), op(&NLSStringFindCharLitS_MBCS_GB18030))}},
+    Row{71,  // NLSStringJustifyS
+        {same(op(&NLSStringJustifyS)),
+         utf(op(&NLSStringJustifyS_UTF8), op(&NLSStringJustifyS_UTFE)),
+         same(op(&NLSStringJustifyS_WCS2)), same(op(&NLSStringJustifyS_WCS4)),
+         same(op(&NLSStringJustifyS_MBCS_modal)),
+         dbcs(op(&NLSStringJustifyS_MBCS_nonmodal), op(&NLSStringJustifyS_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringJustifyS_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringJustifyS_MBCS_nonmodal_GB18030))}},
     Row{72,  // NLSStringLength
         {same(op(&NLSStringLength_SBCS)), utf(op(&NLSStringLength_UTF8), op(&NLSStringLength_UTFE)),
          same(op(&NLSStringLength_WCS2)), same(op(&NLSStringLength_WCS4)),
@@ -297,12 +353,26 @@ const std::array kRows = {
          same(op(&NLSStringFindCharLitC_MBCS_modal)),
          dbcs(op(&NLSStringFindCharLitC_MBCS_nonmodal), op(&NLSStringFindCharLitC_MBCS_EUC_JP),
               op(&NLSStringFindCharLitC_MBCS_EUC_TW), op(&NLSStringFindCharLitC_MBCS_GB18030))}},
+    Row{113,  // NLSStringJustifyC
+        {same(op(&NLSStringJustifyC)), same(op(&NLSStringJustifyC_UTF8)),
+         same(op(&NLSStringJustifyC_WCS2)), same(op(&NLSStringJustifyC_WCS4)),
+         same(op(&NLSStringJustifyC_MBCS_modal)),
+         dbcs(op(&NLSStringJustifyC_MBCS_nonmodal), op(&NLSStringJustifyC_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringJustifyC_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringJustifyC_MBCS_nonmodal_GB18030))}},
     Row{114,  // NLSStringByteLengthC
         {same(op(&NLSStringByteLengthC_SBCS)), same(op(&NLSStringByteLengthC_UTF8)),
          same(op(&NLSStringByteLengthC_WCS2)), same(op(&NLSStringByteLengthC_WCS4)),
          same(op(&NLSStringByteLengthC_MBCS_modal)),
          dbcs(op(&NLSStringByteLengthC_MBCS_nonmodal), op(&NLSStringByteLengthC_MBCS_EUC_JP),
               op(&NLSStringByteLengthC_MBCS_EUC_TW), op(&NLSStringByteLengthC_MBCS_GB18030))}},
+    Row{115,  // NLSStringMoveC
+        {same(op(&NLSStringMoveC_SBCS)), same(op(&NLSStringMoveC_MBCS_UTF8)),
+         same(op(&NLSStringMoveC_WCS2)), same(op(&NLSStringMoveC_WCS4)),
+         same(op(&NLSStringMoveC_MBCS_modal)),
+         dbcs(op(&NLSStringMoveC_MBCS_nonmodal), op(&NLSStringMoveC_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringMoveC_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringMoveC_MBCS_nonmodal_GB18030))}},
     every_class(118, op(&stringAnyNot)),
 };
 
