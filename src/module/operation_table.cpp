@@ -94,6 +94,24 @@ const std::array kRows = {
         {same(op(&stringCurCharSize_FixedSize)), same(op(&stringCurCharSize_UTF8)),
          same(op(&stringCurCharSize_WCS2)), same(op(&stringCurCharSize_FixedSize)),
          same(op(&stringCurCharSize_MBCS_modal)), same(op(&stringCurCharSize_MBCS_nonmodal))}},
+    Row{33,  // NLSStringReverse
+        {same(op(&NLSStringReverse_SBCS)), same(op(&NLSStringReverse_MBCS)),
+         same(op(&NLSStringReverse_WCS2)), same(op(&NLSStringReverse_WCS4)),
+         same(op(&NLSStringReverse_MBCS_modal)), same(op(&NLSStringReverse_MBCS))}},
+    Row{34,  // NLSStringDelete
+        {same(op(&NLSStringDelete_SBCS)), same(op(&NLSStringDelete_MBCS)),
+         endian(op(&NLSStringDelete_WCS2L), op(&NLSStringDelete_WCS2B)),
+         same(op(&NLSStringDelete_WCS4)), same(op(&NLSStringDelete_MBCS_modal)),
+         same(op(&NLSStringDelete_MBCS))}},
+    every_class(35, op(&NLSStringDeleteLit)),
+    Row{38,  // NLSStringSubStr
+        {same(op(&NLSStringSubStr_SBCS)), same(op(&NLSStringSubStr_MBCS_UTF8)),
+         same(op(&NLSStringSubStr_WCS2)), same(op(&NLSStringSubStr_WCS4)),
+         same(op(&NLSStringSubStr_MBCS_modal)), same(op(&NLSStringSubStr_MBCS))}},
+    Row{39,  // NLSStringStrip
+        {same(op(&NLSStringStrip_SBCS)), utf(op(&NLSStringStrip_UTF8), op(&NLSStringStrip_UTFE)),
+         same(op(&NLSStringStrip_WCS2)), same(op(&NLSStringStrip_WCS4)),
+         same(op(&NLSStringStrip_MBCS_modal)), same(op(&NLSStringStrip_MBCS_nonmodal))}},
     Row{40,  // NLSStringByteLength
         {same(op(&NLSStringByteLength_SBCS)),
          utf(op(&NLSStringByteLength_UTF8), op(&NLSStringByteLength_UTFE)),
@@ -114,6 +132,20 @@ const std::array kRows = {
         {same(op(&NLSAllBlanksS_SBCS)), same(op(&NLSAllBlanksS)), same(op(&NLSAllBlanksS_WCS)),
          same(op(&NLSAllBlanksS_WCS)), same(op(&NLSAllBlanksS_MBCS_modal)),
          same(op(&NLSAllBlanksS))}},
+    Row{58,  // NLSStringReverseS
+        {same(op(&NLSStringReverseS_SBCS)), same(op(&NLSStringReverseS_MBCS)),
+         same(op(&NLSStringReverseS_WCS2)), same(op(&NLSStringReverseS_WCS4)),
+         same(op(&NLSStringReverseS_MBCS_modal)), same(op(&NLSStringReverseS_MBCS))}},
+    Row{59,  // NLSStringDeleteS
+        {same(op(&NLSStringDeleteS_SBCS)), same(op(&NLSStringDeleteS_MBCS)),
+         endian(op(&NLSStringDeleteS_WCS2L), op(&NLSStringDeleteS_WCS2B)),
+         same(op(&NLSStringDeleteS_WCS4)), same(op(&NLSStringDeleteS_MBCS_modal)),
+         same(op(&NLSStringDeleteS_MBCS))}},
+    every_class(60, op(&NLSStringDeleteLitS)),
+    Row{64,  // NLSStringStripS
+        {same(op(&NLSStringStripS_SBCS)), utf(op(&NLSStringStripS_UTF8), op(&NLSStringStripS_UTFE)),
+         same(op(&NLSStringStripS_WCS2)), same(op(&NLSStringStripS_WCS4)),
+         same(op(&NLSStringStripS_MBCS_modal)), same(op(&NLSStringStripS_MBCS_nonmodal))}},
     Row{72,  // NLSStringLength
         {same(op(&NLSStringLength_SBCS)), utf(op(&NLSStringLength_UTF8), op(&NLSStringLength_UTFE)),
          same(op(&NLSStringLength_WCS2)), same(op(&NLSStringLength_WCS4)),
@@ -132,6 +164,10 @@ const std::array kRows = {
          same(op(&NLSStringBLength_MBCS_modal)),
          dbcs(op(&NLSStringBLength_MBCS_nonmodal), op(&NLSStringBLength_MBCS_EUC_JP),
               op(&NLSStringBLength_MBCS_EUC_TW), op(&NLSStringBLength_MBCS_GB18030))}},
+    Row{110,  // NLSStringStripC
+        {same(op(&NLSStringStripC_SBCS)), same(op(&NLSStringStripC_UTF8)),
+         same(op(&NLSStringStripC_WCS2)), same(op(&NLSStringStripC_WCS4)),
+         same(op(&NLSStringStripC_MBCS_modal)), same(op(&NLSStringStripC_MBCS_nonmodal))}},
     Row{114,  // NLSStringByteLengthC
         {same(op(&NLSStringByteLengthC_SBCS)), same(op(&NLSStringByteLengthC_UTF8)),
          same(op(&NLSStringByteLengthC_WCS2)), same(op(&NLSStringByteLengthC_WCS4)),
