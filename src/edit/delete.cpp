@@ -15,6 +15,8 @@
 namespace nlssm::edit {
 namespace {
 
+using module::LiteralOutcome;
+
 struct Kept {
   int64_t chars;
   int64_t bytes;
@@ -209,6 +211,22 @@ int64_t delete_wcs2_s(const NLSSMHandle *h, uint8_t *p, int64_t bytes, const uin
   return delete_s_with(h, cursor::Wcs2Model<kBig>(h), p, bytes, list, listBytes);
 }
 
+// The literal in the handle's encoding; a literal that cannot be converted
+// becomes an empty list, which deletes nothing. False when the work buffer
+// could not be had.
+template <class Literal>
+bool literal_list(const NLSSMHandle *h, Literal &lit, const uint8_t *literal, int64_t bytes,
+                  int64_t &length) {
+  const LiteralOutcome outcome =
+      literal == nullptr
+          ? LiteralOutcome::kFailed
+          : lit.convert(h, literal, static_cast<uint64_t>(std::max<int64_t>(0, bytes)));
+  length = outcome == LiteralOutcome::kConverted || outcome == LiteralOutcome::kAsGiven
+               ? static_cast<int64_t>(lit.length())
+               : 0;
+  return outcome != LiteralOutcome::kNoMemory;
+}
+
 using DeleteFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, const NLSString *, int64_t,
                              int64_t);
 using DeleteSFn = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t, const uint8_t *, int64_t);
@@ -219,7 +237,6 @@ using SetPosFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t)
 
 using namespace nlssm::edit;
 using nlssm::module::ConvertedLiteral;
-using nlssm::module::LiteralOutcome;
 
 extern "C" {
 
@@ -304,18 +321,12 @@ int64_t NLSStringDeleteS_MBCS_modal(const NLSSMHandle *h, uint8_t *p, int64_t by
 }
 
 // The literal, converted into the handle's encoding, becomes the list of
-// the handle's own delete. A literal that cannot be converted deletes
-// nothing.
+// the handle's own delete.
 int64_t NLSStringDeleteLit(const NLSSMHandle *h, NLSString *target, int64_t n,
                            const uint8_t *literal, int64_t literalBytes, int64_t flags) {
   ConvertedLiteral<256> lit;
-  const LiteralOutcome outcome =
-      literal == nullptr
-          ? LiteralOutcome::kFailed
-          : lit.convert(h, literal, static_cast<uint64_t>(std::max<int64_t>(0, literalBytes)));
-  if (outcome == LiteralOutcome::kNoMemory) return NLSSM_COUNT_NO_MEMORY;
-  const int64_t length =
-      outcome == LiteralOutcome::kFailed ? 0 : static_cast<int64_t>(lit.length());
+  int64_t length = 0;
+  if (!literal_list(h, lit, literal, literalBytes, length)) return NLSSM_COUNT_NO_MEMORY;
   NLSString list{const_cast<uint8_t *>(lit.text()),
                  static_cast<uint64_t>(length),
                  static_cast<uint64_t>(length),
@@ -338,13 +349,8 @@ int64_t NLSStringDeleteLit(const NLSSMHandle *h, NLSString *target, int64_t n,
 int64_t NLSStringDeleteLitS(const NLSSMHandle *h, uint8_t *target, int64_t bytes,
                             const uint8_t *literal, int64_t literalBytes, int64_t) {
   ConvertedLiteral<256> lit;
-  const LiteralOutcome outcome =
-      literal == nullptr
-          ? LiteralOutcome::kFailed
-          : lit.convert(h, literal, static_cast<uint64_t>(std::max<int64_t>(0, literalBytes)));
-  if (outcome == LiteralOutcome::kNoMemory) return NLSSM_COUNT_NO_MEMORY;
-  const int64_t length =
-      outcome == LiteralOutcome::kFailed ? 0 : static_cast<int64_t>(lit.length());
+  int64_t length = 0;
+  if (!literal_list(h, lit, literal, literalBytes, length)) return NLSSM_COUNT_NO_MEMORY;
   if (h->NLSStringDeleteS == nullptr) return 0;
   return reinterpret_cast<DeleteSFn>(h->NLSStringDeleteS)(h, target, bytes, lit.text(), length);
 }

@@ -77,6 +77,13 @@ int64_t check_buffer(const uint8_t *p, int64_t bytes) {
   return p == nullptr && bytes > 0 ? NLSSM_E_NULL_ARGUMENT : NLSSM_OK;
 }
 
+template <int kWidth>
+int64_t reverse_buffer(uint8_t *p, int64_t bytes) {
+  if (check_buffer(p, bytes) != 0 || bytes <= 0) return check_buffer(p, bytes);
+  reverse_units<kWidth>(p, bytes);
+  return NLSSM_OK;
+}
+
 // The first n characters (all when n is 0 or more than remain) from the
 // current character, measured by the class's model.
 template <class M>
@@ -108,9 +115,7 @@ int64_t NLSStringReverse_SBCS(const NLSSMHandle *h, NLSString *s, int64_t n) {
   return reverse_plain<1>(SbcsModel(h), s, n);
 }
 int64_t NLSStringReverseS_SBCS(const NLSSMHandle *, uint8_t *p, int64_t bytes) {
-  if (check_buffer(p, bytes) != 0 || bytes <= 0) return check_buffer(p, bytes);
-  reverse_units<1>(p, bytes);
-  return NLSSM_OK;
+  return reverse_buffer<1>(p, bytes);
 }
 
 // Two-byte text swaps units; n counts characters (a surrogate pair is one).
@@ -119,18 +124,14 @@ int64_t NLSStringReverse_WCS2(const NLSSMHandle *h, NLSString *s, int64_t n) {
                             : reverse_plain<2>(Wcs2Model<false>(h), s, n);
 }
 int64_t NLSStringReverseS_WCS2(const NLSSMHandle *, uint8_t *p, int64_t bytes) {
-  if (check_buffer(p, bytes) != 0 || bytes <= 0) return check_buffer(p, bytes);
-  reverse_units<2>(p, bytes);
-  return NLSSM_OK;
+  return reverse_buffer<2>(p, bytes);
 }
 
 int64_t NLSStringReverse_WCS4(const NLSSMHandle *h, NLSString *s, int64_t n) {
   return reverse_plain<4>(FixedModel(h), s, n);
 }
 int64_t NLSStringReverseS_WCS4(const NLSSMHandle *, uint8_t *p, int64_t bytes) {
-  if (check_buffer(p, bytes) != 0 || bytes <= 0) return check_buffer(p, bytes);
-  reverse_units<4>(p, bytes);
-  return NLSSM_OK;
+  return reverse_buffer<4>(p, bytes);
 }
 
 int64_t NLSStringReverse_MBCS(const NLSSMHandle *h, NLSString *s, int64_t n) {

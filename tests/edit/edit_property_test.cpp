@@ -9,16 +9,6 @@
 namespace edit_test {
 namespace {
 
-using ReverseS = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t);
-using Reverse = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t);
-using DeleteS = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t, const uint8_t *, int64_t);
-using Delete = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, const NLSString *, int64_t,
-                           int64_t);
-using SubStr = int64_t (*)(const NLSSMHandle *, const NLSString *, NLSString *, int64_t, int64_t *,
-                           int64_t);
-using StripS = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, int64_t);
-using Strip = int64_t (*)(const NLSSMHandle *, const NLSString *, int64_t, int64_t);
-
 class EditProperty : public ::testing::TestWithParam<int> {
  protected:
   void SetUp() override {

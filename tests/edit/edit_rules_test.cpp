@@ -6,17 +6,6 @@
 namespace edit_test {
 namespace {
 
-using ReverseS = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t);
-using DeleteS = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t, const uint8_t *, int64_t);
-using Delete = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, const NLSString *, int64_t,
-                           int64_t);
-using DeleteLitS = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t, const uint8_t *, int64_t,
-                               int64_t);
-using SubStr = int64_t (*)(const NLSSMHandle *, const NLSString *, NLSString *, int64_t, int64_t *,
-                           int64_t);
-using StripS = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, int64_t);
-using Strip = int64_t (*)(const NLSSMHandle *, const NLSString *, int64_t, int64_t);
-
 constexpr uint8_t SO = 0x0E, SI = 0x0F;
 constexpr int kModal = 130, kLatin1 = 29, kEbcdic = 78, kUtf8 = 20;
 

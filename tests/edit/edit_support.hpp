@@ -28,6 +28,19 @@ inline const NLSSMHandle *handle(int encoding) {
   return host().create_handle(encoding, &h) == 0 ? h : nullptr;
 }
 
+// The prototypes of the operations, for calls through their slots.
+using ReverseS = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t);
+using Reverse = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t);
+using DeleteS = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t, const uint8_t *, int64_t);
+using Delete = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, const NLSString *, int64_t,
+                           int64_t);
+using DeleteLitS = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t, const uint8_t *, int64_t,
+                               int64_t);
+using SubStr = int64_t (*)(const NLSSMHandle *, const NLSString *, NLSString *, int64_t, int64_t *,
+                           int64_t);
+using StripS = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, int64_t);
+using Strip = int64_t (*)(const NLSSMHandle *, const NLSString *, int64_t, int64_t);
+
 template <typename Fn, typename... Args>
 auto call(const NLSSMHandle *h, NLSSlot slot, Args... args) {
   return reinterpret_cast<Fn>(slot)(h, args...);
