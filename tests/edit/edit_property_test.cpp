@@ -74,7 +74,7 @@ TEST_P(EditProperty, ReversingTwiceGivesTheTextBack) {
 TEST_P(EditProperty, DeleteLeavesNoListedCharacterAndKeepsTheLength) {
   const Bytes blank = encode(h, U" ");
   for (int round = 0; round < 200; ++round) {
-    const std::u32string t = random_text(rng, chars, 30);
+    const std::u32string t = random_text(rng, chars, 80);
     const std::u32string list = random_text(rng, chars, 4);
     std::u32string kept;
     std::copy_if(t.begin(), t.end(), std::back_inserter(kept),
