@@ -162,6 +162,38 @@ TEST_P(EditProperty, StripMeasuresTheTextWithoutItsTrailingBlanks) {
   }
 }
 
+// Arbitrary bytes, broken characters and stray shift sequences included:
+// every operation keeps to its buffers and gives the pool back.
+TEST_P(EditProperty, ArbitraryBytesStayWithinTheirBuffers) {
+  std::uniform_int_distribution<int> byte(0, 255);
+  for (int round = 0; round < 300; ++round) {
+    Bytes text(std::uniform_int_distribution<size_t>(0, 24)(rng));
+    for (uint8_t &b : text)
+      b = static_cast<uint8_t>(round % 3 == 0 ? 0x0E + byte(rng) % 3 : byte(rng));
+    Bytes list(text.begin(), text.begin() + static_cast<ptrdiff_t>(text.size() / 3));
+    const auto n = static_cast<int64_t>(text.size());
+    const int64_t count = std::uniform_int_distribution<int64_t>(0, 6)(rng), flags = round % 2;
+    const PoolWatch pool{h};
+    Bytes b = with_guard(text), l = with_guard(list), dst(text.size() / 2 + 8, 0xEE);
+    call<ReverseS>(h, h->NLSStringReverseS, b.data(), n);
+    call<DeleteS>(h, h->NLSStringDeleteS, b.data(), n, l.data(), static_cast<int64_t>(list.size()));
+    call<StripS>(h, h->NLSStringStripS, b.data(), n, flags);
+    NLSString s = at_char(h, b, text.size(), count / 2), ls = at_char(h, l, list.size(), 0);
+    NLSString d{dst.data(), 0, text.size() / 2, 0, -9, -9, -1, 0, 0, 0};
+    int64_t copied = 0;
+    call<Reverse>(h, h->NLSStringReverse, &s, count);
+    call<Delete>(h, h->NLSStringDelete, &s, count, &ls, count, flags);
+    call<Strip>(h, h->NLSStringStrip, &s, count, flags);
+    if (count != 0 || h->NLSStringMoveS != nullptr || h->encodingClass == NLSSM_CLASS_SBCS ||
+        h->encodingClass == NLSSM_CLASS_WCS2 || h->encodingClass == NLSSM_CLASS_WCS4)
+      call<SubStr>(h, h->NLSStringSubStr, &s, &d, count, &copied, flags);
+    ASSERT_TRUE(guard_intact(b, text.size()) && guard_intact(l, list.size()) &&
+                guard_intact(dst, text.size() / 2) && pool.balanced())
+        << round;
+    ASSERT_LE(d.length, text.size() / 2);
+  }
+}
+
 INSTANTIATE_TEST_SUITE_P(Encodings, EditProperty, ::testing::ValuesIn(kEncodings), encoding_name);
 
 }  // namespace
