@@ -53,11 +53,14 @@ void BM_ReverseS(benchmark::State &state) {
   state.SetBytesProcessed(state.iterations() * static_cast<int64_t>(text.size()));
 }
 
-// Deletes from a fresh copy each pass; the list is one character or three.
+// Deletes from a fresh copy each pass; the list is one character of the
+// text, three, or (0) one byte the text does not hold.
 void BM_DeleteS(benchmark::State &state) {
   const NLSSMHandle *h = handle(static_cast<int>(state.range(0)));
   const Bytes text = text_for(h);
-  const Bytes list = state.range(1) == 1 ? Bytes{text[1]} : Bytes{text[0], text[1], text[2]};
+  const Bytes list = state.range(1) == 0   ? Bytes{'~'}
+                     : state.range(1) == 1 ? Bytes{text[1]}
+                                           : Bytes{text[0], text[1], text[2]};
   Bytes work(text.size());
   for (auto _ : state) {
     std::memcpy(work.data(), text.data(), text.size());
@@ -86,7 +89,13 @@ void BM_SubStr(benchmark::State &state) {
 
 // Latin-1 (29), UTF-8 (20), Shift_JIS (135), IBM-930 modal (130).
 BENCHMARK(BM_ReverseS)->Arg(29)->Arg(20)->Arg(135)->Arg(130);
-BENCHMARK(BM_DeleteS)->Args({29, 1})->Args({29, 3})->Args({20, 1})->Args({135, 3})->Args({130, 3});
+BENCHMARK(BM_DeleteS)
+    ->Args({29, 0})
+    ->Args({29, 1})
+    ->Args({29, 3})
+    ->Args({20, 1})
+    ->Args({135, 3})
+    ->Args({130, 3});
 BENCHMARK(BM_SubStr)->Arg(29)->Arg(20)->Arg(135)->Arg(130);
 
 }  // namespace

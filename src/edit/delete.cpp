@@ -8,6 +8,7 @@
 #include <cstring>
 
 #include "edit/character_walk.hpp"
+#include "edit/delete_byte.hpp"
 #include "edit/modal_text.hpp"
 #include "module/literal.hpp"
 #include "module/work_buffer.hpp"
@@ -49,28 +50,24 @@ Kept close_up(const NLSSMHandle *h, const M &m, uint8_t *p, int64_t bytes, Keep 
   return {chars, w};
 }
 
-// Single bytes close up without branches: every byte is stored at the
-// write position, which moves on only for a byte that is kept. A one-byte
-// list is compared directly, a longer one becomes a table of 256 flags.
-template <class Drop>
-Kept close_up_bytes(const NLSSMHandle *h, uint8_t *p, int64_t bytes, Drop drop) {
+// Single bytes: a one-byte list takes the vector path; a longer one becomes
+// a table of 256 flags and closes up without branches.
+Kept delete_bytes(const NLSSMHandle *h, uint8_t *p, int64_t bytes, const uint8_t *list,
+                  int64_t listBytes) {
   int64_t w = 0;
-  for (int64_t r = 0; r < bytes; ++r) {
-    const uint8_t b = p[r];
-    p[w] = b;
-    w += drop(b) ? 0 : 1;
+  if (listBytes == 1) {
+    w = delete_byte_ops.get().drop(p, bytes, list[0]);
+  } else {
+    std::array<bool, 256> in{};
+    for (int64_t i = 0; i < listBytes; ++i) in[list[i]] = true;
+    for (int64_t r = 0; r < bytes; ++r) {
+      const uint8_t b = p[r];
+      p[w] = b;
+      w += in[b] ? 0 : 1;
+    }
   }
   fill_blanks(h, p + w, bytes - w);
   return {w, w};
-}
-
-Kept delete_bytes(const NLSSMHandle *h, uint8_t *p, int64_t bytes, const uint8_t *list,
-                  int64_t listBytes) {
-  const uint8_t only = list[0];
-  if (listBytes == 1) return close_up_bytes(h, p, bytes, [only](uint8_t b) { return b == only; });
-  std::array<bool, 256> in{};
-  for (int64_t i = 0; i < listBytes; ++i) in[list[i]] = true;
-  return close_up_bytes(h, p, bytes, [&in](uint8_t b) { return in[b]; });
 }
 
 template <class M>

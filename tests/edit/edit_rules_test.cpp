@@ -1,6 +1,9 @@
 // The stated rules of substring, delete, reverse and strip on small texts,
 // and the work-buffer failures driven by the reference host's fault
 // injection.
+#include <algorithm>
+
+#include "edit/delete_byte.hpp"
 #include "edit_support.hpp"
 
 namespace edit_test {
@@ -174,6 +177,26 @@ TEST(EditRules, StripKnowsOnlyTheEncodingsBlankAndTheseWhiteSpaceSequences) {
   const NLSString s = at_char(u, text, 5, 0);
   EXPECT_EQ(call<Strip>(u, u->NLSStringStrip, &s, int64_t{2}, int64_t{0}), 2);
   EXPECT_EQ(call<Strip>(u, u->NLSStringStrip, &s, int64_t{2}, int64_t{1}), 3);
+}
+
+// Each vector variant of the one-byte delete that this processor runs
+// against the scalar rule, over bytes that hold the byte rarely to often
+// and lengths around the register sizes.
+TEST(EditRules, VectorByteDeleteAgreesWithTheScalarRule) {
+  std::mt19937 rng(5);
+  for (const auto &variant : nlssm::edit::delete_byte_ops.variants()) {
+    if (!kernel::cpu::supports(variant.isa)) continue;
+    for (int round = 0; round < 2000; ++round) {
+      Bytes text(std::uniform_int_distribution<size_t>(0, 100)(rng));
+      const int spread = 1 << (round % 8);
+      for (uint8_t &b : text) b = static_cast<uint8_t>(rng() % spread);
+      Bytes want = text, got = text;
+      const int64_t n = static_cast<int64_t>(text.size());
+      const int64_t kept = nlssm::edit::drop_byte_scalar(want.data(), n, 0);
+      ASSERT_EQ(variant.table->drop(got.data(), n, 0), kept) << kernel::cpu::name(variant.isa);
+      ASSERT_TRUE(std::equal(want.begin(), want.begin() + kept, got.begin()));
+    }
+  }
 }
 
 }  // namespace
