@@ -134,7 +134,6 @@ struct WideRule {
   bool strippable(uint32_t c) const { return all ? white_space(c) : c == 0x20; }
 };
 
-template <int kWidth>
 WideRule wide_rule(const NLSSMHandle *h, int64_t flags) {
   return {wide_big_endian(h), (flags & kAllWhiteSpace) != 0};
 }
@@ -144,7 +143,7 @@ WideRule wide_rule(const NLSSMHandle *h, int64_t flags) {
 template <int kWidth>
 int64_t wide_count_kept(const NLSSMHandle *h, const uint8_t *p, int64_t bytes, int64_t limit,
                         int64_t flags) {
-  const WideRule rule = wide_rule<kWidth>(h, flags);
+  const WideRule rule = wide_rule(h, flags);
   int64_t off = 0, chars = 0, run = 0;
   while (off + kWidth <= bytes && (limit <= 0 || chars < limit)) {
     const uint32_t c = wide_unit<kWidth>(p + off, rule.big);
@@ -162,9 +161,10 @@ int64_t wide_count_kept(const NLSSMHandle *h, const uint8_t *p, int64_t bytes, i
 template <int kWidth>
 int64_t wide_strip_s(const NLSSMHandle *h, const uint8_t *p, int64_t bytes, int64_t flags) {
   if (p == nullptr || bytes <= 0) return 0;
-  const WideRule rule = wide_rule<kWidth>(h, flags);
-  bytes -= bytes % kWidth;
-  while (bytes > 0 && rule.strippable(wide_unit<kWidth>(p + bytes - kWidth, rule.big)))
+  const WideRule rule = wide_rule(h, flags);
+  // Units are read back from the end, so a length that is not a whole
+  // number of units keeps its odd bytes at the start.
+  while (bytes >= kWidth && rule.strippable(wide_unit<kWidth>(p + bytes - kWidth, rule.big)))
     bytes -= kWidth;
   return bytes;
 }
