@@ -301,7 +301,7 @@ int64_t NLSStringDeleteS_MBCS(const NLSSMHandle *h, uint8_t *p, int64_t bytes, c
 int64_t NLSStringDelete_MBCS_modal(const NLSSMHandle *h, NLSString *target, int64_t n,
                                    const NLSString *list, int64_t m, int64_t) {
   const Remaining t = remaining_of(target);
-  if (t.text == nullptr) return 0;
+  if (t.bytes == 0) return 0;
   const ModalModel model(h);
   ModalRange range{target->buffer, target->curOffset, 0, static_cast<int64_t>(target->length),
                    modal_double_at(model, target->buffer, target->curOffset)};

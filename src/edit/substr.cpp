@@ -32,7 +32,8 @@ int64_t room_at(const NLSString *dst, int64_t offset) {
 // bit 0 blank-fills the rest of the buffer (in whole blanks of `unit`
 // bytes) and takes its length to there.
 void finish_copy(const NLSSMHandle *h, NLSString *dst, const Copy &c, int64_t flags, int64_t unit) {
-  dst->length = std::max<uint64_t>(dst->length, static_cast<uint64_t>(c.offset + c.bytes));
+  if (c.bytes > 0)
+    dst->length = std::max<uint64_t>(dst->length, static_cast<uint64_t>(c.offset + c.bytes));
   if (c.status != 0 || (flags & NLSSM_EDIT_PAD) == 0) return;
   const auto length = static_cast<int64_t>(dst->length);
   int64_t fill = std::max<int64_t>(0, static_cast<int64_t>(dst->capacity) - length);
@@ -154,7 +155,8 @@ int64_t move_rest(const NLSSMHandle *h, const Remaining &r, NLSString *dst, int6
   c.status = reinterpret_cast<MoveSFn>(h->NLSStringMoveS)(h, r.text, r.bytes, dst->buffer + dstOff,
                                                           room_at(dst, dstOff), &c.bytes,
                                                           flags & NLSSM_EDIT_PAD);
-  dst->length = std::max<uint64_t>(dst->length, static_cast<uint64_t>(dstOff + c.bytes));
+  if (c.bytes > 0)
+    dst->length = std::max<uint64_t>(dst->length, static_cast<uint64_t>(dstOff + c.bytes));
   if (c.status == 0 && (flags & NLSSM_EDIT_PAD) != 0) dst->length = dst->capacity;
   return c.status;
 }
@@ -198,9 +200,11 @@ ModalCopy copy_modal(const NLSSMHandle *h, const NLSString *src, NLSString *dst,
                      int64_t n) {
   const ModalModel m(h);
   const int64_t room = room_at(dst, dstOff);
-  const bool dstDbl = modal_double_at(m, dst->buffer, dstOff);
-  ModalWalk walk(m, src->buffer, src->curOffset, static_cast<int64_t>(src->length),
-                 modal_double_at(m, src->buffer, src->curOffset));
+  const auto srcLength = static_cast<int64_t>(src->length);
+  const int64_t from = std::min(src->curOffset, srcLength);
+  const bool dstDbl =
+      modal_double_at(m, dst->buffer, std::min(dstOff, static_cast<int64_t>(dst->capacity)));
+  ModalWalk walk(m, src->buffer, from, srcLength, modal_double_at(m, src->buffer, from));
   ModalItem item;
   int64_t start = -1, end = 0, runStart = -1, join = 0, chars = 0;
   bool firstDbl = false, endDbl = false, truncated = false;
@@ -267,8 +271,9 @@ int64_t substr_modal(const NLSSMHandle *h, const NLSString *src, NLSString *dst,
   // The whole rest goes to the move when both sides are in single-byte
   // width where they meet; otherwise it is copied character by character
   // so that the join gets its shift sequence.
-  if (n <= 0 && !modal_double_at(m, src->buffer, src->curOffset) &&
-      !modal_double_at(m, dst->buffer, dstOff)) {
+  const int64_t srcAt = r.text - src->buffer;
+  if (n <= 0 && !modal_double_at(m, src->buffer, srcAt) &&
+      !modal_double_at(m, dst->buffer, std::min(dstOff, static_cast<int64_t>(dst->capacity)))) {
     Copy c;
     move_rest(h, r, dst, dstOff, flags, c);
     if (c.status == 0) restart_modal(h, dst);

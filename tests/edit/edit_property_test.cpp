@@ -180,6 +180,10 @@ TEST_P(EditProperty, ArbitraryBytesStayWithinTheirBuffers) {
     call<StripS>(h, h->NLSStringStripS, b.data(), n, flags);
     NLSString s = at_char(h, b, text.size(), count / 2), ls = at_char(h, l, list.size(), 0);
     NLSString d{dst.data(), 0, text.size() / 2, 0, -9, -9, -1, 0, 0, 0};
+    if (round % 5 == 4) {  // offsets past the text and past the destination's room
+      s.charIndex = s.curOffset = static_cast<int64_t>(text.size()) + 3;
+      d.charIndex = d.curOffset = static_cast<int64_t>(d.capacity) + 3;
+    }
     int64_t copied = 0;
     call<Reverse>(h, h->NLSStringReverse, &s, count);
     call<Delete>(h, h->NLSStringDelete, &s, count, &ls, count, flags);
