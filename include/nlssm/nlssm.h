@@ -1360,6 +1360,172 @@ NLSSM_API int64_t NLSStringLike_MBCS_nonmodal2_EBCDIC(const NLSSMHandle *handle,
                                                       const NLSString *pattern, int64_t escape);
 
 /* ---- Substring, delete, reverse and strip --------------------------------- */
+/* Reverse (slots 33, 58): the order of the first n characters from the
+ * current one (0 or more than remain: all; S forms: the whole buffer), in
+ * place. Single-byte, two-byte and four-byte text swap whole units (two-byte
+ * text counts n in characters but swaps units, so a surrogate pair is turned
+ * round); multi-byte text keeps the bytes of each character in order. Modal
+ * text turns shift sequences round; a text that ends in another width than
+ * it starts gets the shift into that width in front and loses its last
+ * bytes to it. Answers 0, NLSSM_E_NO_MEMORY when the modal work buffer could
+ * not be had (the text is then unchanged), or NLSSM_E_NULL_ARGUMENT. */
+NLSSM_API int64_t NLSStringReverse_SBCS(const NLSSMHandle *handle, NLSString *string, int64_t n);
+NLSSM_API int64_t NLSStringReverseS_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t bytes);
+NLSSM_API int64_t NLSStringReverse_WCS2(const NLSSMHandle *handle, NLSString *string, int64_t n);
+NLSSM_API int64_t NLSStringReverseS_WCS2(const NLSSMHandle *handle, uint8_t *buffer, int64_t bytes);
+NLSSM_API int64_t NLSStringReverse_WCS4(const NLSSMHandle *handle, NLSString *string, int64_t n);
+NLSSM_API int64_t NLSStringReverseS_WCS4(const NLSSMHandle *handle, uint8_t *buffer, int64_t bytes);
+NLSSM_API int64_t NLSStringReverse_MBCS(const NLSSMHandle *handle, NLSString *string, int64_t n);
+NLSSM_API int64_t NLSStringReverseS_MBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t bytes);
+NLSSM_API int64_t NLSStringReverse_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                              int64_t n);
+NLSSM_API int64_t NLSStringReverseS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                               int64_t bytes);
+
+/* Delete (slots 34, 59, 35, 60): every character of the target's first n
+ * characters from its current one (0 or more than remain: all) that occurs
+ * in the list's first m characters is taken out; the kept characters close
+ * up and the freed bytes at the end of the range become blanks. Answers the
+ * characters kept (S forms: the bytes kept), 0 for an unset target, the
+ * range's character count for an unset or empty list, and
+ * NLSSM_COUNT_NO_MEMORY when a work buffer could not be had (the target is
+ * then unchanged). Flags are not used. Modal text: shift sequences are
+ * rewritten around the characters kept; a range followed by more text ends
+ * in the width it ended in before (blanks go where the width is single, or
+ * as pairs of blank bytes where it is double). The literal forms convert the
+ * literal from encoding 62 and call the handle's NLSStringDelete or
+ * NLSStringDeleteS; a literal that cannot be converted deletes nothing. */
+NLSSM_API int64_t NLSStringDelete_SBCS(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                       const NLSString *list, int64_t m, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_SBCS(const NLSSMHandle *handle, uint8_t *target,
+                                        int64_t targetBytes, const uint8_t *list,
+                                        int64_t listBytes);
+NLSSM_API int64_t NLSStringDelete_WCS2L(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                        const NLSString *list, int64_t m, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_WCS2L(const NLSSMHandle *handle, uint8_t *target,
+                                         int64_t targetBytes, const uint8_t *list,
+                                         int64_t listBytes);
+NLSSM_API int64_t NLSStringDelete_WCS2B(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                        const NLSString *list, int64_t m, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_WCS2B(const NLSSMHandle *handle, uint8_t *target,
+                                         int64_t targetBytes, const uint8_t *list,
+                                         int64_t listBytes);
+NLSSM_API int64_t NLSStringDelete_WCS4(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                       const NLSString *list, int64_t m, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_WCS4(const NLSSMHandle *handle, uint8_t *target,
+                                        int64_t targetBytes, const uint8_t *list,
+                                        int64_t listBytes);
+NLSSM_API int64_t NLSStringDelete_MBCS(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                       const NLSString *list, int64_t m, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_MBCS(const NLSSMHandle *handle, uint8_t *target,
+                                        int64_t targetBytes, const uint8_t *list,
+                                        int64_t listBytes);
+NLSSM_API int64_t NLSStringDelete_MBCS_modal(const NLSSMHandle *handle, NLSString *target,
+                                             int64_t n, const NLSString *list, int64_t m,
+                                             int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_MBCS_modal(const NLSSMHandle *handle, uint8_t *target,
+                                              int64_t targetBytes, const uint8_t *list,
+                                              int64_t listBytes);
+NLSSM_API int64_t NLSStringDeleteLit(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                     const uint8_t *literal, int64_t literalBytes, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteLitS(const NLSSMHandle *handle, uint8_t *target,
+                                      int64_t targetBytes, const uint8_t *literal,
+                                      int64_t literalBytes, int64_t flags);
+
+/* Substring (slot 38): up to n characters (0 or more than remain: all) of
+ * the source from its current character, copied into the destination at its
+ * current offset (single-byte: at the charIndex of both; an unset wide or
+ * multi-byte destination is written from its start). Whole characters only:
+ * what does not fit is left out with NLSSM_E_DEST_TOO_SMALL and no padding.
+ * Flag bit 0 (NLSSM_EDIT_PAD) blank-fills the rest of an untruncated
+ * destination and takes its length to the capacity (wide text: to the last
+ * whole unit). The destination's length becomes at least the end of the
+ * copy. bytesCopied (may be null) receives the bytes written, shift
+ * sequences included. An unset source copies nothing and answers 0; a null
+ * descriptor answers NLSSM_E_NULL_ARGUMENT.
+ * Multi-byte members (UTF-8, UTF-EBCDIC, double-byte, EUC, GB18030, modal)
+ * with n of 0 hand the rest of the source to the handle's NLSStringMoveS
+ * (NLSSM_E_UNSUPPORTED when that slot is empty); afterwards the destination
+ * is positioned again through stringSetPos. Modal text keeps its shift state
+ * balanced: a shift sequence at the join when the widths differ, a closing
+ * shift-in (double-byte characters are given back to make room for it), and
+ * the rest of a source in double-byte width, or into a destination in
+ * double-byte width at the write offset, is copied character by character
+ * rather than moved. */
+NLSSM_API int64_t NLSStringSubStr_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                       NLSString *destination, int64_t n, int64_t *bytesCopied,
+                                       int64_t flags);
+NLSSM_API int64_t NLSStringSubStr_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                       NLSString *destination, int64_t n, int64_t *bytesCopied,
+                                       int64_t flags);
+NLSSM_API int64_t NLSStringSubStr_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                       NLSString *destination, int64_t n, int64_t *bytesCopied,
+                                       int64_t flags);
+NLSSM_API int64_t NLSStringSubStr_MBCS_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                            NLSString *destination, int64_t n, int64_t *bytesCopied,
+                                            int64_t flags);
+NLSSM_API int64_t NLSStringSubStr_MBCS(const NLSSMHandle *handle, const NLSString *source,
+                                       NLSString *destination, int64_t n, int64_t *bytesCopied,
+                                       int64_t flags);
+NLSSM_API int64_t NLSStringSubStr_MBCS_modal(const NLSSMHandle *handle, const NLSString *source,
+                                             NLSString *destination, int64_t n,
+                                             int64_t *bytesCopied, int64_t flags);
+
+/* Strip (slots 39, 64, 110): the length of the text up to its last
+ * character that is not a blank; nothing is moved. Flag bit 0 strips every
+ * white-space character (U+0009-000D, 0020, 0085, 00A0, 1680, 2000-200A,
+ * 2028, 2029, 202F, 205F, 3000): single-byte text by the class table's
+ * white-space bit, double-byte non-modal text the blank and the bytes 9-13,
+ * modal text the trailing bytes 0x40, 0x0E and 0x0F; UTF-8 recognises the
+ * sequences of those characters at the end (and E1 81 A8 and E1 82 8E in
+ * place of U+1680 and U+180E). Plain forms answer characters from the
+ * current one: single-byte, wide and non-modal text look at the first n
+ * characters only; UTF-8 and UTF-EBCDIC strip the whole rest and count at
+ * most n characters, or, with bit 0, all that remain; modal text stops after
+ * n characters, or with bit 0 ignores n. S forms answer bytes; C forms take
+ * and answer characters (NLSStringStripC_UTF8 serves UTF-EBCDIC handles by
+ * their own rule). Unset descriptors and null buffers answer 0. */
+NLSSM_API int64_t NLSStringStrip_SBCS(const NLSSMHandle *handle, const NLSString *string, int64_t n,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringStripS_SBCS(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_UTF8(const NLSSMHandle *handle, const NLSString *string, int64_t n,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringStripS_UTF8(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_UTFE(const NLSSMHandle *handle, const NLSString *string, int64_t n,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringStripS_UTFE(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_WCS2(const NLSSMHandle *handle, const NLSString *string, int64_t n,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringStripS_WCS2(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_WCS4(const NLSSMHandle *handle, const NLSString *string, int64_t n,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringStripS_WCS4(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_MBCS_modal(const NLSSMHandle *handle, const NLSString *string,
+                                            int64_t n, int64_t flags);
+NLSSM_API int64_t NLSStringStripS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                             int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *string,
+                                               int64_t n, int64_t flags);
+NLSSM_API int64_t NLSStringStripS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                                int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_SBCS(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t chars, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_UTF8(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t chars, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_WCS2(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t chars, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_WCS4(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t chars, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                             int64_t chars, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                                int64_t chars, int64_t flags);
+
 
 /* ---- Move, fill, concatenate, justify and add quotes ---------------------- */
 /* Move (slots 63, 115): copies sourceLength bytes of source (characters

@@ -144,6 +144,24 @@ const std::array kRows = {
                      op(&NLSStringToIntmax_toQVChar)),
          ascii_ebcdic(op(&NLSStringToIntmax_ASCII), op(&NLSStringToIntmax_EBCDIC)),
          ascii_ebcdic(op(&NLSStringToIntmax_ASCII), op(&NLSStringToIntmax_EBCDIC))}},
+    Row{33,  // NLSStringReverse
+        {same(op(&NLSStringReverse_SBCS)), same(op(&NLSStringReverse_MBCS)),
+         same(op(&NLSStringReverse_WCS2)), same(op(&NLSStringReverse_WCS4)),
+         same(op(&NLSStringReverse_MBCS_modal)), same(op(&NLSStringReverse_MBCS))}},
+    Row{34,  // NLSStringDelete
+        {same(op(&NLSStringDelete_SBCS)), same(op(&NLSStringDelete_MBCS)),
+         endian(op(&NLSStringDelete_WCS2L), op(&NLSStringDelete_WCS2B)),
+         same(op(&NLSStringDelete_WCS4)), same(op(&NLSStringDelete_MBCS_modal)),
+         same(op(&NLSStringDelete_MBCS))}},
+    every_class(35, op(&NLSStringDeleteLit)),
+    Row{38,  // NLSStringSubStr
+        {same(op(&NLSStringSubStr_SBCS)), same(op(&NLSStringSubStr_MBCS_UTF8)),
+         same(op(&NLSStringSubStr_WCS2)), same(op(&NLSStringSubStr_WCS4)),
+         same(op(&NLSStringSubStr_MBCS_modal)), same(op(&NLSStringSubStr_MBCS))}},
+    Row{39,  // NLSStringStrip
+        {same(op(&NLSStringStrip_SBCS)), utf(op(&NLSStringStrip_UTF8), op(&NLSStringStrip_UTFE)),
+         same(op(&NLSStringStrip_WCS2)), same(op(&NLSStringStrip_WCS4)),
+         same(op(&NLSStringStrip_MBCS_modal)), same(op(&NLSStringStrip_MBCS_nonmodal))}},
     Row{40,  // NLSStringByteLength
         {same(op(&NLSStringByteLength_SBCS)),
          utf(op(&NLSStringByteLength_UTF8), op(&NLSStringByteLength_UTFE)),
@@ -201,6 +219,16 @@ const std::array kRows = {
          dbcs(op(&NLSStringIndexS_MBCS_nonmodal), op(&NLSStringIndexS_MBCS_nonmodal_EUC_JP),
               op(&NLSStringIndexS_MBCS_nonmodal_EUC_TW),
               op(&NLSStringIndexS_MBCS_nonmodal_GB18030))}},
+    Row{58,  // NLSStringReverseS
+        {same(op(&NLSStringReverseS_SBCS)), same(op(&NLSStringReverseS_MBCS)),
+         same(op(&NLSStringReverseS_WCS2)), same(op(&NLSStringReverseS_WCS4)),
+         same(op(&NLSStringReverseS_MBCS_modal)), same(op(&NLSStringReverseS_MBCS))}},
+    Row{59,  // NLSStringDeleteS
+        {same(op(&NLSStringDeleteS_SBCS)), same(op(&NLSStringDeleteS_MBCS)),
+         endian(op(&NLSStringDeleteS_WCS2L), op(&NLSStringDeleteS_WCS2B)),
+         same(op(&NLSStringDeleteS_WCS4)), same(op(&NLSStringDeleteS_MBCS_modal)),
+         same(op(&NLSStringDeleteS_MBCS))}},
+    every_class(60, op(&NLSStringDeleteLitS)),
     Row{63,  // NLSStringMoveS
         {same(op(&NLSStringMoveS_SBCS)), same(op(&NLSStringMoveS_MBCS_UTF8)),
          same(op(&NLSStringMoveS_WCS2)), same(op(&NLSStringMoveS_WCS4)),
@@ -208,6 +236,10 @@ const std::array kRows = {
          dbcs(op(&NLSStringMoveS_MBCS_nonmodal), op(&NLSStringMoveS_MBCS_nonmodal_EUC_JP),
               op(&NLSStringMoveS_MBCS_nonmodal_EUC_TW),
               op(&NLSStringMoveS_MBCS_nonmodal_GB18030))}},
+    Row{64,  // NLSStringStripS
+        {same(op(&NLSStringStripS_SBCS)), utf(op(&NLSStringStripS_UTF8), op(&NLSStringStripS_UTFE)),
+         same(op(&NLSStringStripS_WCS2)), same(op(&NLSStringStripS_WCS4)),
+         same(op(&NLSStringStripS_MBCS_modal)), same(op(&NLSStringStripS_MBCS_nonmodal))}},
     Row{65,  // NLSStringAddQuotesS
         {same(op(&NLSStringAddQuotesS)),
          utf(op(&NLSStringAddQuotesS_UTF8), op(&NLSStringAddQuotesS_UTFE)),
@@ -341,6 +373,10 @@ const std::array kRows = {
          dbcs(op(&NLSStringIndexC_MBCS_nonmodal), op(&NLSStringIndexC_MBCS_nonmodal_EUC_JP),
               op(&NLSStringIndexC_MBCS_nonmodal_EUC_TW),
               op(&NLSStringIndexC_MBCS_nonmodal_GB18030))}},
+    Row{110,  // NLSStringStripC
+        {same(op(&NLSStringStripC_SBCS)), same(op(&NLSStringStripC_UTF8)),
+         same(op(&NLSStringStripC_WCS2)), same(op(&NLSStringStripC_WCS4)),
+         same(op(&NLSStringStripC_MBCS_modal)), same(op(&NLSStringStripC_MBCS_nonmodal))}},
     Row{111,  // NLSStringFindCharLitC
         {same(op(&NLSStringFindCharLitC_SBCS)), same(op(&NLSStringFindCharLitC_UTF8)),
          same(op(&NLSStringFindCharLitC_WCS2)), same(op(&NLSStringFindCharLitC_WCS4)),
