@@ -34,9 +34,12 @@ struct CharSet {
   std::bitset<256> singles;
   bool multi = false;
 
+  // Only modal text has a double-byte mode; the other models keep kinds.
+  static bool double_mode(uint32_t state) { return M::kModal && cursor::modal_double(state); }
+
   CharSet(const M &m, Span s, uint32_t state) : model(m), set(s), start(state) {
     walk([&](const uint8_t *p, int64_t size, uint32_t mode) {
-      if (size == 1 && !cursor::modal_double(mode))
+      if (size == 1 && !double_mode(mode))
         singles.set(*p);
       else
         multi = true;
@@ -57,12 +60,11 @@ struct CharSet {
     }
   }
   bool has(const uint8_t *p, int64_t size, uint32_t mode) const {
-    const bool dbl = cursor::modal_double(mode);
+    const bool dbl = double_mode(mode);
     if (size == 1 && !dbl) return singles.test(*p);
     if (!multi) return false;
     return walk([&](const uint8_t *q, int64_t n, uint32_t m) {
-      return n == size && cursor::modal_double(m) == dbl &&
-             std::memcmp(p, q, static_cast<size_t>(n)) == 0;
+      return n == size && double_mode(m) == dbl && std::memcmp(p, q, static_cast<size_t>(n)) == 0;
     });
   }
 };
