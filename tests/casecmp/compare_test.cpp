@@ -7,6 +7,7 @@
 #include <nlssm/reference_host.hpp>
 
 #include <climits>
+#include <ostream>
 #include <random>
 #include <string>
 #include <vector>
@@ -115,6 +116,10 @@ struct ClassCase {
   int encoding;
   int unit;  // bytes of one ASCII character
 };
+
+void PrintTo(const ClassCase &c, std::ostream *os) {
+  *os << "encoding " << c.encoding;
+}
 
 class EveryClass : public ::testing::TestWithParam<ClassCase> {};
 
