@@ -49,6 +49,19 @@ inline bool span_from(const NLSString *s, int64_t start, Span &out) {
   return true;
 }
 
+// A descriptor over a converted literal, on its first character (none when
+// it is empty), in single-byte shift state.
+inline NLSString text_descriptor(const uint8_t *text, int64_t bytes) {
+  NLSString s{};
+  s.buffer = const_cast<uint8_t *>(text);
+  s.length = s.capacity = static_cast<uint64_t>(bytes);
+  s.curOffset = bytes > 0 ? 0 : NLSSM_POS_NONE;
+  s.nextOffset = NLSSM_POS_NONE;
+  s.prevOffset = NLSSM_POS_NO_PREVIOUS;
+  s.charKind = cursor::kModalSingle;
+  return s;
+}
+
 // A positive count limits both operands of a byte-counted comparison: when
 // it does not exceed the shorter one, both are cut to it.
 inline void limit_bytes(int64_t &la, int64_t &lb, int64_t count) {

@@ -11,11 +11,7 @@
 namespace nlssm::casecmp {
 namespace {
 
-using cursor::DbcsModel;
-using cursor::EucJpModel;
-using cursor::EucTwModel;
 using cursor::FixedModel;
-using cursor::Gb18030Model;
 using cursor::SbcsModel;
 using cursor::Wcs2Model;
 

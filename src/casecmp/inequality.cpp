@@ -206,13 +206,7 @@ int64_t NLSStringNotEqualLit(const NLSSMHandle *h, const NLSString *s, int64_t c
   const auto notEqual = reinterpret_cast<cc::NotEqualFn>(h->NLSStringNotEqual);
   if (notEqual == nullptr) return 0;
   return cc::with_set(h, literal, length, [&](const uint8_t *text, int64_t bytes) {
-    NLSString set{};
-    set.buffer = const_cast<uint8_t *>(text);
-    set.length = set.capacity = static_cast<uint64_t>(bytes);
-    set.curOffset = 0;
-    set.nextOffset = NLSSM_POS_NONE;
-    set.prevOffset = NLSSM_POS_NO_PREVIOUS;
-    set.charKind = nlssm::cursor::kModalSingle;
+    const NLSString set = cc::text_descriptor(text, bytes);
     return notEqual(h, s, count, &set, 0);
   });
 }

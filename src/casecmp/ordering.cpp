@@ -384,13 +384,7 @@ int64_t comp_lit(const NLSSMHandle *h, const NLSString *a, const uint8_t *litera
                  uint32_t options, CompStrFn compStr) {
   if (a == nullptr || a->buffer == nullptr || compStr == nullptr) return 0;
   return with_literal(h, literal, length, [&](const uint8_t *text, int64_t bytes) {
-    NLSString lit{};
-    lit.buffer = const_cast<uint8_t *>(text);
-    lit.length = lit.capacity = static_cast<uint64_t>(bytes);
-    lit.curOffset = bytes > 0 ? 0 : NLSSM_POS_NONE;
-    lit.nextOffset = NLSSM_POS_NONE;
-    lit.prevOffset = NLSSM_POS_NO_PREVIOUS;
-    lit.charKind = cursor::kModalSingle;
+    NLSString lit = text_descriptor(text, bytes);
     if (bytes > 0 && h->encodingClass != NLSSM_CLASS_SBCS && h->encodingClass != NLSSM_CLASS_WCS4 &&
         h->stringSetPos != nullptr)
       reinterpret_cast<int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t)>(
