@@ -232,6 +232,33 @@ inline uint32_t host_fold(uint32_t c) {
                                                                       NLSHOST_FOLD_DEFAULT);
 }
 
+// Case mappings as one comparison asks for them: the owner's lower or upper
+// mapping, or the host's folding. The first 256 code points are asked once
+// each and remembered, so that text differing in case throughout costs one
+// query per distinct Latin-1 character.
+class CaseCache {
+ public:
+  enum class Map : uint8_t { kLower, kUpper, kFold };
+  CaseCache(const NLSSMHandle *h, Map map) : h_(h), map_(map) {}
+  uint32_t map(uint32_t c) {
+    if (c >= 256) return ask(c);
+    if (!known_[c]) {
+      value_[c] = ask(c);
+      known_[c] = true;
+    }
+    return value_[c];
+  }
+
+ private:
+  uint32_t ask(uint32_t c) const {
+    return map_ == Map::kFold ? host_fold(c) : case_of(h_, c, map_ == Map::kUpper);
+  }
+  const NLSSMHandle *h_;
+  Map map_;
+  bool known_[256] = {};
+  uint32_t value_[256];
+};
+
 // ---- Wide units --------------------------------------------------------------------
 
 inline uint32_t load_unit(const uint8_t *p, int width, bool big) {

@@ -98,6 +98,7 @@ bool char_spans(const M &m, const uint8_t *pa, int64_t ca, const uint8_t *pb, in
 template <class Codec>
 int64_t equals_utf(const NLSSMHandle *h, Span a, Span b, int32_t options) {
   int64_t i = 0, j = 0, floorA = 0, floorB = 0;
+  CaseCache folded(h, CaseCache::Map::kFold);
   for (;;) {
     const int64_t n = std::min(a.n - i, b.n - j);
     const int64_t d = mismatch(a.p + i, b.p + j, n);
@@ -110,7 +111,7 @@ int64_t equals_utf(const NLSSMHandle *h, Span a, Span b, int32_t options) {
       ++back;
     const Decoded da = Codec::decode(a.p + i - back, a.n - (i - back));
     const Decoded db = Codec::decode(b.p + j - back, b.n - (j - back));
-    if (!da.ok || !db.ok || host_fold(da.cp) != host_fold(db.cp)) return 0;
+    if (!da.ok || !db.ok || folded.map(da.cp) != folded.map(db.cp)) return 0;
     floorA = i = i - back + da.size;
     floorB = j = j - back + db.size;
   }
@@ -159,6 +160,7 @@ int64_t equals_wide(const NLSSMHandle *h, Span a, Span b, int64_t count, int32_t
   uint8_t *ca = copyA.data(), *cb = copyB.data();
   const int width = h->encodingClass == NLSSM_CLASS_WCS4 ? 4 : 2;
   const bool big = h->encodingNumber == (width == 4 ? NLSSM_ENC_WCS4_BE : NLSSM_ENC_WCS2_BE);
+  CaseCache lower(h, CaseCache::Map::kLower);
   for (int64_t i = 0;;) {
     i += mismatch(ca + i, cb + i, common - i);
     if (i >= common) break;
@@ -167,7 +169,7 @@ int64_t equals_wide(const NLSSMHandle *h, Span a, Span b, int64_t count, int32_t
     for (uint8_t *copy : {ca, cb}) {
       const uint32_t unit = load_unit(copy + u, width, big);
       if (width == 4 || (unit & 0xF800) != 0xD800)
-        store_unit(copy + u, case_of(h, unit, false), width, big);
+        store_unit(copy + u, lower.map(unit), width, big);
     }
     if (std::memcmp(ca + u, cb + u, static_cast<size_t>(width)) != 0) return 0;
     i = u + width;

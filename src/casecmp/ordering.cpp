@@ -55,6 +55,10 @@ const uint8_t *fold_table(const NLSSMHandle *h, uint32_t options) {
   return nullptr;
 }
 
+CaseCache::Map case_map(uint32_t options) {
+  return options & kFoldLower ? CaseCache::Map::kLower : CaseCache::Map::kUpper;
+}
+
 // The comparison walk: equal prefixes by the vector compare, differences by
 // the handler, then the tail of the longer operand (against the blank when
 // padding, else the shorter one's end decides).
@@ -151,18 +155,18 @@ int64_t order_bytes(const NLSSMHandle *h, const M &m, const Operand &a, const Op
 // malformed sequence is compared by its bytes.
 template <class Codec>
 struct UtfFold {
-  const NLSSMHandle *h;
   Operand a, b;
   bool upper;
+  CaseCache cases;
   int64_t resumeA = 0, resumeB = 0;
 
-  uint32_t fold(uint32_t c) const {
+  uint32_t fold(uint32_t c) {
     if (c < 0x80) {
       if (upper && c >= 'a' && c <= 'z') return c - 0x20;
       if (!upper && c >= 'A' && c <= 'Z') return c + 0x20;
       return c;
     }
-    return case_of(h, c, upper);
+    return cases.map(c);
   }
   // Start of the character holding byte i of p: back over trailing bytes,
   // never before the point where the operands last agreed on a boundary.
@@ -193,7 +197,8 @@ int64_t order_utf(const NLSSMHandle *h, const Operand &a, const Operand &b, uint
     RawBytes raw{a.p, b.p};
     return run_order(a, b, raw, pad, tail);
   }
-  UtfFold<Codec> fold{h, a, b, (options & kFoldLower) == 0};
+  const bool upper = (options & kFoldLower) == 0;
+  UtfFold<Codec> fold{a, b, upper, CaseCache(h, case_map(options))};
   return run_order(a, b, fold, pad, tail);
 }
 
@@ -204,9 +209,9 @@ int64_t order_utf(const NLSSMHandle *h, const Operand &a, const Operand &b, uint
 // decide.
 template <int kWidth, bool kBig>
 struct WcsUnits {
-  const NLSSMHandle *h;
   Operand a, b;
-  bool fold, upper;
+  bool fold;
+  CaseCache cases;
   int64_t resume = 0;  // a character boundary in both operands
 
   uint32_t unit(const uint8_t *p, int64_t off) const { return load_unit(p + off, kWidth, kBig); }
@@ -226,7 +231,7 @@ struct WcsUnits {
       }
     }
     if (fold) {
-      const uint32_t fa = case_of(h, va, upper), fb = case_of(h, vb, upper);
+      const uint32_t fa = cases.map(va), fb = cases.map(vb);
       if (fa == fb) {
         resume = u + kWidth;
         return go_on(resume, resume);
@@ -240,7 +245,7 @@ struct WcsUnits {
 template <int kWidth, bool kBig>
 int64_t order_units(const NLSSMHandle *h, const Operand &a, const Operand &b, uint32_t options) {
   const bool fold = (options & (kFoldLower | kFoldUpper)) != 0;
-  WcsUnits<kWidth, kBig> units{h, a, b, fold, (options & kFoldLower) == 0};
+  WcsUnits<kWidth, kBig> units{a, b, fold, CaseCache(h, case_map(options))};
   return run_order(a, b, units, (options & kPad) != 0, unit_tail(h, kWidth, kBig));
 }
 
