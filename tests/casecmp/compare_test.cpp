@@ -152,16 +152,40 @@ TEST_P(EveryClass, OrderSignAndPositionWithAndWithoutPad) {
       slot<CompLit>(h->NLSStringCompLit)(h, &sa, reinterpret_cast<const uint8_t *>("AB"), 2, 0), 0);
 }
 
+// Through the S slot, or (UTF-EBCDIC, which has none) the C slot with
+// lengths in characters.
+int64_t equals_any(const NLSSMHandle *h, const std::u32string &a, const std::u32string &b,
+                   int32_t options = 0) {
+  const Bytes x = encode(h, a), y = encode(h, b);
+  if (h->NLSStringEqualsS != nullptr) return equals_s(h, x, y, options);
+  return slot<EqualsS>(h->NLSStringEqualsC)(h, x.data(), static_cast<int64_t>(a.size()), y.data(),
+                                            static_cast<int64_t>(b.size()), options);
+}
+
 TEST_P(EveryClass, EqualityFoldsCaseAndPadsWithBlanks) {
   const NLSSMHandle *h = handle(GetParam().encoding);
   ASSERT_NE(h, nullptr);
-  if (h->NLSStringEqualsS == nullptr) GTEST_SKIP() << "no EqualsS slot in this encoding";
-  const Bytes mixed = encode(h, U"Hello Hello Hello"), lower = encode(h, U"hello hello hello"),
-              other = encode(h, U"hello hello hellp"), padded = encode(h, U"Hello Hello Hello    ");
-  EXPECT_EQ(equals_s(h, mixed, lower), 1);
-  EXPECT_EQ(equals_s(h, mixed, other), 0);
-  EXPECT_EQ(equals_s(h, mixed, padded), 0);
-  EXPECT_EQ(equals_s(h, mixed, padded, 1), 1);
+  const std::u32string mixed = U"Hello Hello Hello", padded = U"Hello Hello Hello    ";
+  EXPECT_EQ(equals_any(h, mixed, U"hello hello hello"), 1);
+  EXPECT_EQ(equals_any(h, mixed, U"hello hello hellp"), 0);
+  EXPECT_EQ(equals_any(h, mixed, padded), 0);
+  EXPECT_EQ(equals_any(h, mixed, padded, 1), 1);
+}
+
+TEST_P(EveryClass, CharacterCountedAndLiteralForms) {
+  const NLSSMHandle *h = handle(GetParam().encoding);
+  ASSERT_NE(h, nullptr);
+  const int64_t u = GetParam().unit;
+  const Bytes ab1 = encode(h, U"AB1"), ab2 = encode(h, U"AB2");
+  const auto compStrC = slot<CompareS>(h->NLSStringCompStrC);
+  EXPECT_EQ(compStrC(h, ab1.data(), 2, ab2.data(), 2, 0), 0);
+  EXPECT_EQ(compStrC(h, ab1.data(), 3, ab2.data(), 3, 0), -(2 * u + 1));
+  EXPECT_EQ(compStrC(h, ab1.data(), 3, nullptr, 3, 0), 0);
+  const auto *literal = reinterpret_cast<const uint8_t *>("AB2");
+  EXPECT_EQ(slot<LitS>(h->NLSStringCompLitS)(h, ab1.data(), static_cast<int64_t>(ab1.size()),
+                                             literal, 3, 0),
+            -(2 * u + 1));
+  EXPECT_EQ(slot<LitS>(h->NLSStringCompLitC)(h, ab1.data(), 2, literal, 2, 0), 0);
 }
 
 TEST_P(EveryClass, FoldedOrderAndAntisymmetry) {
