@@ -92,7 +92,9 @@ struct Walker {
   Walker(const M &m, const uint8_t *text, int64_t length, uint32_t start = cursor::kModalSingle)
       : model(m), p(text), n(length), state(start) {}
 
-  int64_t size_here() const { return model.unit(p + off, n - off, state).size; }
+  // Bytes of the character at `off`, never past the end of the text (a
+  // wide unit or a lead byte cut off by the end is what is left of it).
+  int64_t size_here() const { return std::min(model.unit(p + off, n - off, state).size, n - off); }
   // Moves to the character that holds byte i; true when it starts at i.
   bool reach(int64_t i) {
     for (;;) {

@@ -80,7 +80,7 @@ int64_t first_not_in_chars(const M &m, Span s, uint32_t state, int64_t count, co
   for (;;) {
     m.skip_shifts(s.p, w.off, s.n, w.state);
     if (w.off >= s.n || (count > 0 && index >= count)) return -1;
-    const int64_t size = std::min(w.size_here(), s.n - w.off);
+    const int64_t size = w.size_here();
     if (!set.has(s.p + w.off, size, w.state)) return index;
     if (counts(s.p[w.off])) ++index;
     w.state = m.kind(size, w.state);
