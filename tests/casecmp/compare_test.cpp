@@ -141,9 +141,8 @@ TEST_P(EveryClass, OrderSignAndPositionWithAndWithoutPad) {
   // Descriptor form with a count of characters, and the literal form.
   EXPECT_EQ(comp_str(h, ab1, ab2, 2, 0, h->NLSStringCompStr), 0);
   EXPECT_EQ(comp_str(h, ab1, ab2, 3, 0, h->NLSStringCompStr), -(2 * u + 1));
-  NLSString sa = at_start(const_cast<Bytes &>(ab1));
-  const std::string lit = h->encodingFlags & 1 ? "AB2" : "\xC1\xC2\xF2";
-  (void)lit;
+  Bytes first = ab1;
+  NLSString sa = at_start(first);
   // The literal arrives in encoding 62 (ASCII-based).
   EXPECT_EQ(
       slot<CompLit>(h->NLSStringCompLit)(h, &sa, reinterpret_cast<const uint8_t *>("AB2"), 3, 0),
@@ -366,6 +365,36 @@ TEST(MultiByte, DoubleByteCharactersAreNeverFolded) {
     EXPECT_EQ(compare_s(h, upper, lower, NLSSM_OPT_FOLD_LOWER), -3) << encoding;
     EXPECT_EQ(equals_s(h, upper, lower), 0);
     EXPECT_EQ(equals_s(h, Bytes{'x', 'A'}, Bytes{'X', 'a'}), 1);
+  }
+}
+
+// One multi-byte character of each length rule: counts of characters,
+// character positions and the comparison all measure it whole.
+TEST(MultiByte, LengthRulesOfEachSet) {
+  struct Case {
+    int encoding;
+    Bytes character;
+  };
+  for (const Case &c : {Case{134, {0x8F, 0xA2, 0xAF}}, Case{119, {0x8E, 0xA2, 0xA1, 0xA1}},
+                        Case{205, {0x81, 0x30, 0x81, 0x30}}, Case{135, {0x83, 0x41}},
+                        Case{129, {0x0E, 0x42, 0xC1, 0x0F}}}) {
+    const NLSSMHandle *h = handle(c.encoding);
+    ASSERT_NE(h, nullptr);
+    Bytes x = c.character, y = c.character, twice = c.character;
+    x.push_back('x');
+    y.push_back('y');
+    twice.insert(twice.end(), c.character.begin(), c.character.end());
+    const auto n = static_cast<int64_t>(c.character.size());
+    EXPECT_EQ(comp_str(h, x, y, 1, 0, h->NLSStringCompStr), 0) << c.encoding;
+    EXPECT_EQ(comp_str(h, x, y, 2, 0, h->NLSStringCompStr), -(n + 1)) << c.encoding;
+    // The last byte of the character differs: never folded, never equal.
+    Bytes changed = c.character;
+    changed[c.character.size() - (c.encoding == 129 ? 2 : 1)] ^= 0x01;
+    EXPECT_EQ(equals_s(h, c.character, changed), 0) << c.encoding;
+    twice.push_back('a');
+    Bytes one = c.character;
+    NLSString text = at_start(twice), set = at_start(one);
+    EXPECT_EQ(slot<NotEqual>(h->NLSStringNotEqual)(h, &text, 0, &set, 0), 2) << c.encoding;
   }
 }
 
