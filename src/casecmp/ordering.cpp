@@ -296,7 +296,7 @@ using Wcs4B = WcsClass<4, true>;
 // Compare member, from its character index). Without a current character it
 // is empty when padding, and the comparison does not take place otherwise.
 template <class C>
-bool operand(const NLSSMHandle *h, const NLSString *s, bool pad, bool fromIndex, Operand &out) {
+bool operand(const NLSString *s, bool pad, bool fromIndex, Operand &out) {
   if (s == nullptr || s->buffer == nullptr) return false;
   if (s->curOffset < 0 && !pad) return false;
   const int64_t start = s->curOffset < 0 ? static_cast<int64_t>(s->length)
@@ -306,7 +306,6 @@ bool operand(const NLSSMHandle *h, const NLSString *s, bool pad, bool fromIndex,
   if (!span_from(s, start, span)) return false;
   out = {span.p, span.n, cursor::kModalSingle};
   if constexpr (std::is_same_v<C, Modal>) out.state = modal_start(s);
-  (void)h;
   return true;
 }
 
@@ -317,7 +316,7 @@ int64_t comp_str(const NLSSMHandle *h, const NLSString *sa, const NLSString *sb,
                  uint32_t options, bool fromIndex = false) {
   const bool pad = (options & kPad) != 0;
   Operand a, b;
-  if (!operand<C>(h, sa, pad, fromIndex, a) || !operand<C>(h, sb, pad, fromIndex, b)) return 0;
+  if (!operand<C>(sa, pad, fromIndex, a) || !operand<C>(sb, pad, fromIndex, b)) return 0;
   if constexpr (std::is_same_v<C, Sbcs>) {
     limit_bytes(a.n, b.n, count);
   } else if (count > 0) {
@@ -356,7 +355,7 @@ int64_t compare_sbcs(const NLSSMHandle *h, const NLSString *sa, const NLSString 
   if (!pad || fold_table(h, options) != nullptr)
     return comp_str<Sbcs>(h, sa, sb, count, options, true);
   Operand a, b;
-  if (!operand<Sbcs>(h, sa, pad, true, a) || !operand<Sbcs>(h, sb, pad, true, b)) return 0;
+  if (!operand<Sbcs>(sa, pad, true, a) || !operand<Sbcs>(sb, pad, true, b)) return 0;
   limit_bytes(a.n, b.n, count);
   const bool ascii = (h->encodingFlags & 1u) != 0;
   RawBytes raw{a.p, b.p, !ascii};
