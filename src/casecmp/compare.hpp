@@ -29,6 +29,23 @@ inline int64_t mismatch(const uint8_t *a, const uint8_t *b, int64_t n) {
   return n > 0 ? kernel::hot().mem_mismatch(a, b, n) : 0;
 }
 
+// The vector compare from (i, j) on, to the end of the shorter operand; each
+// difference goes to `at(i, j)`, which moves both offsets past it and
+// answers true to go on, or false to stop there. True when an end was
+// reached.
+template <class At>
+bool scan(const uint8_t *a, int64_t na, const uint8_t *b, int64_t nb, int64_t &i, int64_t &j,
+          At at) {
+  for (;;) {
+    const int64_t n = std::min(na - i, nb - j);
+    const int64_t d = mismatch(a + i, b + j, n);
+    i += d;
+    j += d;
+    if (d == n) return true;
+    if (!at(i, j)) return false;
+  }
+}
+
 inline int64_t signed_at(bool greater, int64_t k) {
   return greater ? k + 1 : -(k + 1);
 }
@@ -203,6 +220,19 @@ struct UtfeCodec {
     return {cp, n, true};
   }
 };
+
+// How far before the differing bytes a[i] and b[j] their characters start:
+// back over trailing bytes (at most four), never before the offsets where the
+// operands last met on a character boundary.
+template <class Codec>
+int64_t back_to_start(const uint8_t *a, int64_t i, int64_t floorA, const uint8_t *b, int64_t j,
+                      int64_t floorB) {
+  int64_t back = 0;
+  while (back < 4 && i - back > floorA && j - back > floorB &&
+         (Codec::continuation(a[i - back]) || Codec::continuation(b[j - back])))
+    ++back;
+  return back;
+}
 
 // Lead-length model of a UTF codec, for walking characters by count.
 template <class Codec>

@@ -48,17 +48,17 @@ template <class M>
 bool equal_folded(const M &m, const uint8_t *a, const uint8_t *b, int64_t n, const uint8_t *table,
                   uint32_t state) {
   Walker<M> walk(m, a, n, state);
-  for (int64_t i = 0;;) {
-    i += mismatch(a + i, b + i, n - i);
-    if (i >= n) return true;
+  int64_t i = 0, j = 0;
+  return scan(a, n, b, n, i, j, [&](int64_t &x, int64_t &y) {
     if constexpr (!std::is_same_v<M, SbcsModel>) {
-      if (!walk.reach(i)) return false;
+      if (!walk.reach(x)) return false;
       if (M::kModal && cursor::modal_double(walk.state)) return false;
       walk.step_one();
     }
-    if (table == nullptr || table[a[i]] != table[b[i]]) return false;
-    ++i;
-  }
+    if (table == nullptr || table[a[x]] != table[b[x]]) return false;
+    y = ++x;
+    return true;
+  });
 }
 
 template <class M>
@@ -99,22 +99,16 @@ template <class Codec>
 int64_t equals_utf(const NLSSMHandle *h, Span a, Span b, int32_t options) {
   int64_t i = 0, j = 0, floorA = 0, floorB = 0;
   CaseCache folded(h, CaseCache::Map::kFold);
-  for (;;) {
-    const int64_t n = std::min(a.n - i, b.n - j);
-    const int64_t d = mismatch(a.p + i, b.p + j, n);
-    i += d;
-    j += d;
-    if (d == n) break;
-    int64_t back = 0;
-    while (back < 4 && i - back > floorA && j - back > floorB &&
-           (Codec::continuation(a.p[i - back]) || Codec::continuation(b.p[j - back])))
-      ++back;
-    const Decoded da = Codec::decode(a.p + i - back, a.n - (i - back));
-    const Decoded db = Codec::decode(b.p + j - back, b.n - (j - back));
-    if (!da.ok || !db.ok || folded.map(da.cp) != folded.map(db.cp)) return 0;
-    floorA = i = i - back + da.size;
-    floorB = j = j - back + db.size;
-  }
+  const bool ended = scan(a.p, a.n, b.p, b.n, i, j, [&](int64_t &x, int64_t &y) {
+    const int64_t back = back_to_start<Codec>(a.p, x, floorA, b.p, y, floorB);
+    const Decoded da = Codec::decode(a.p + x - back, a.n - (x - back));
+    const Decoded db = Codec::decode(b.p + y - back, b.n - (y - back));
+    if (!da.ok || !db.ok || folded.map(da.cp) != folded.map(db.cp)) return false;
+    floorA = x = x - back + da.size;
+    floorB = y = y - back + db.size;
+    return true;
+  });
+  if (!ended) return 0;
   if (a.n - i == b.n - j) return 1;
   if ((options & 1) == 0) return 0;
   const Span &rest = a.n - i > b.n - j ? Span{a.p + i, a.n - i} : Span{b.p + j, b.n - j};
@@ -161,19 +155,19 @@ int64_t equals_wide(const NLSSMHandle *h, Span a, Span b, int64_t count, int32_t
   const int width = h->encodingClass == NLSSM_CLASS_WCS4 ? 4 : 2;
   const bool big = h->encodingNumber == (width == 4 ? NLSSM_ENC_WCS4_BE : NLSSM_ENC_WCS2_BE);
   CaseCache lower(h, CaseCache::Map::kLower);
-  for (int64_t i = 0;;) {
-    i += mismatch(ca + i, cb + i, common - i);
-    if (i >= common) break;
-    const int64_t u = i - i % width;
-    if (u + width > common) return 0;
+  int64_t i = 0, j = 0;
+  const bool equal = scan(ca, common, cb, common, i, j, [&](int64_t &x, int64_t &y) {
+    const int64_t u = x - x % width;
+    if (u + width > common) return false;
     for (uint8_t *copy : {ca, cb}) {
       const uint32_t unit = load_unit(copy + u, width, big);
       if (width == 4 || (unit & 0xF800) != 0xD800)
         store_unit(copy + u, lower.map(unit), width, big);
     }
-    if (std::memcmp(ca + u, cb + u, static_cast<size_t>(width)) != 0) return 0;
-    i = u + width;
-  }
+    x = y = u + width;
+    return std::memcmp(ca + u, cb + u, static_cast<size_t>(width)) == 0;
+  });
+  if (!equal) return 0;
   if (!mode.pad) return 1;
   const Span longer = a.n >= b.n ? Span{ca, a.n} : Span{cb, b.n};
   if ((longer.n - common) % width != 0) return 0;

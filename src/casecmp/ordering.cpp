@@ -64,18 +64,15 @@ CaseCache::Map case_map(uint32_t options) {
 // padding, else the shorter one's end decides).
 template <class H>
 int64_t run_order(const Operand &a, const Operand &b, H &handler, bool pad, const Tail &tail) {
-  int64_t i = 0, j = 0;
-  for (;;) {
-    const int64_t n = std::min(a.n - i, b.n - j);
-    const int64_t d = mismatch(a.p + i, b.p + j, n);
-    i += d;
-    j += d;
-    if (d == n) break;
-    const Step s = handler.at(i, j);
-    if (s.decided) return s.result;
-    i = s.i;
-    j = s.j;
-  }
+  int64_t i = 0, j = 0, result = 0;
+  const bool ended = scan(a.p, a.n, b.p, b.n, i, j, [&](int64_t &x, int64_t &y) {
+    const Step s = handler.at(x, y);
+    result = s.result;
+    x = s.i;
+    y = s.j;
+    return !s.decided;
+  });
+  if (!ended) return result;
   const int64_t restA = a.n - i, restB = b.n - j;
   if (restA == restB) return 0;
   uint32_t c = 0;
@@ -168,15 +165,8 @@ struct UtfFold {
     }
     return cases.map(c);
   }
-  // Start of the character holding byte i of p: back over trailing bytes,
-  // never before the point where the operands last agreed on a boundary.
-  static int64_t start_of(const uint8_t *p, int64_t i, int64_t floor) {
-    int64_t s = i;
-    while (s > floor && i - s < 4 && Codec::continuation(p[s])) --s;
-    return s;
-  }
   Step at(int64_t i, int64_t j) {
-    const int64_t back = std::min(i - start_of(a.p, i, resumeA), j - start_of(b.p, j, resumeB));
+    const int64_t back = back_to_start<Codec>(a.p, i, resumeA, b.p, j, resumeB);
     const int64_t sa = i - back, sb = j - back;
     const Decoded da = Codec::decode(a.p + sa, a.n - sa);
     const Decoded db = Codec::decode(b.p + sb, b.n - sb);
