@@ -992,13 +992,13 @@ NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string
  * SBCS, modal and non-modal members: a positive count limits both operands
  * to count bytes when it does not exceed the shorter one. Bytes that differ
  * at the start of a character are folded as single bytes; a character whose
- * first bytes agree must agree whole (double-byte characters and, in modal
- * text, anything in double-byte mode are not folded). With bit 1 the longer
- * operand's bytes from twice the common length on must be the blank byte (the
- * bytes right after the common part are not tested). Non-modal character
- * lengths follow the handle's lead/trail flags, or the EUC-JP (134), EUC-TW
- * (119, 120, 159) and GB18030 (205) rules. Modal descriptors start in the
- * shift state of their charKind and must start in the same one.
+ * first bytes agree must agree whole (in modal text nothing in double-byte
+ * mode is folded). With bit 1 the longer operand's bytes from twice the
+ * common length on must be the blank byte (the bytes right after the common
+ * part are not tested). Non-modal character lengths follow the handle's
+ * lead/trail flags, or the EUC-JP (134), EUC-TW (119, 120, 159) and GB18030
+ * (205) rules. Modal descriptors start in the shift state of their charKind
+ * and must start in the same one.
  * UTF-8 members (the C member reads UTF-EBCDIC on UTF-EBCDIC handles): fold
  * through the host's default case folding, read only option bit 1, and take
  * a positive count as a number of characters of each operand; with bit 1 the
