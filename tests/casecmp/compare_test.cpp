@@ -348,6 +348,11 @@ TEST(Utf8, FoldsThroughTheHostAcrossLengths) {
   EXPECT_EQ(compare_s(h, encode(h, U"\u212Ay"), encode(h, U"kz"), NLSSM_OPT_FOLD_LOWER), -4);
   EXPECT_EQ(equals_s(h, encode(h, U"\u00C4pfel \u212A"), encode(h, U"\u00E4PFEL k")), 1);
   EXPECT_EQ(equals_s(h, encode(h, U"\u00C4pfel"), encode(h, U"\u00E4pfelx")), 0);
+  // A count takes that many characters of each operand.
+  Bytes x = encode(h, U"\u00C4pfelx"), y = encode(h, U"\u00E4PFELy");
+  NLSString sx = at_start(x), sy = at_start(y);
+  EXPECT_EQ(slot<Equals>(h->NLSStringEquals)(h, &sx, &sy, 5, 0), 1);
+  EXPECT_EQ(slot<Equals>(h->NLSStringEquals)(h, &sx, &sy, 6, 0), 0);
   // Malformed bytes equal only themselves.
   EXPECT_EQ(equals_s(h, {0xC3}, {0xC4}), 0);
   EXPECT_EQ(equals_s(h, {0xC3}, {0xC3}), 1);
@@ -406,6 +411,13 @@ TEST(MultiByte, ModalTextFoldsOnlyInSingleByteMode) {
   EXPECT_EQ(equals_s(h, dbUpper, dbLower), 0);
   EXPECT_EQ(compare_s(h, dbUpper, dbLower, NLSSM_OPT_FOLD_LOWER), 3);
   EXPECT_EQ(equals_s(h, Bytes{0x0F, 0xC1}, Bytes{0x0F, 0x81}), 1);
+  // Descriptors start in the shift state their kind names.
+  Bytes x{0x42, 0xC1}, y{0x42, 0x81};
+  NLSString sx = at_start(x), sy = at_start(y);
+  const auto equals = slot<Equals>(h->NLSStringEquals);
+  EXPECT_EQ(equals(h, &sx, &sy, 0, 0), 1);
+  sx.charKind = sy.charKind = NLSSM_KIND_DOUBLE;
+  EXPECT_EQ(equals(h, &sx, &sy, 0, 0), 0);
   // A trailing shift-in is not a non-blank when padding.
   EXPECT_EQ(compare_s(h, Bytes{0xC1}, Bytes{0xC1, 0x40, 0x0E, 0x0F}, NLSSM_OPT_PAD), 0);
 }
