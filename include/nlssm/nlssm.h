@@ -984,6 +984,311 @@ NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string
 /* ---- Case mapping and normalization --------------------------------------- */
 
 /* ---- Equality, inequality and ordering comparison ------------------------- */
+/* Equality (slots 10, 52, 105). 1 when equal, else 0; every failure (a null
+ * or unpositioned operand, bad options, no work buffer) answers 0. Plain forms
+ * compare each operand from its current character to its length; S forms
+ * take byte lengths; C forms take lengths in characters (no byte limit is
+ * checked; the SBCS C member is the S member).
+ * Options: 0 folds through lowerTable and needs equal lengths; bit 1 folds
+ * through lowerTable and lets the longer operand carry trailing blanks; bit 2
+ * (bit 1 clear) folds through upperTable; any other value answers 0.
+ * SBCS, modal and non-modal members: a positive count limits both operands
+ * to count bytes when it does not exceed the shorter one. Bytes that differ
+ * at the start of a character are folded as single bytes; a character whose
+ * first bytes agree must agree whole (in modal text nothing in double-byte
+ * mode is folded). With bit 1 the longer operand's bytes from twice the
+ * common length on must be the blank byte (the bytes right after the common
+ * part are not tested). Non-modal character lengths follow the handle's
+ * lead/trail flags, or the EUC-JP (134), EUC-TW (119, 120, 159) and GB18030
+ * (205) rules. Modal descriptors start in the shift state of their charKind
+ * and must start in the same one.
+ * UTF-8 members (the C member reads UTF-EBCDIC on UTF-EBCDIC handles): fold
+ * through the host's default case folding, read only option bit 1, and take
+ * a positive count as a number of characters of each operand; with bit 1 the
+ * rest of the longer operand must be blank bytes. A malformed sequence equals
+ * only identical bytes.
+ * Generic members (WCS2, WCS4): copy both operands into work buffers (1024
+ * bytes each on the stack, else the handle's pool) and lower-case them there
+ * through the owner's character query; count in bytes; two empty operands are
+ * not equal; with bit 1 the rest of the longer operand must be whole blank
+ * units. */
+NLSSM_API int64_t NLSStringEquals_SBCS(const NLSSMHandle *handle, const NLSString *a,
+                                       const NLSString *b, int64_t count, int32_t options);
+NLSSM_API int64_t NLSStringEqualsS_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                        int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                        int32_t options);
+NLSSM_API int64_t NLSStringEqualsC_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                        int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                        int32_t options);
+NLSSM_API int64_t NLSStringEquals_UTF8(const NLSSMHandle *handle, const NLSString *a,
+                                       const NLSString *b, int64_t count, int32_t options);
+NLSSM_API int64_t NLSStringEqualsS_UTF8(const NLSSMHandle *handle, const uint8_t *a,
+                                        int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                        int32_t options);
+NLSSM_API int64_t NLSStringEqualsC_UTF8(const NLSSMHandle *handle, const uint8_t *a,
+                                        int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                        int32_t options);
+NLSSM_API int64_t NLSStringEquals(const NLSSMHandle *handle, const NLSString *a, const NLSString *b,
+                                  int64_t count, int32_t options);
+NLSSM_API int64_t NLSStringEqualsS(const NLSSMHandle *handle, const uint8_t *a, int64_t lengthA,
+                                   const uint8_t *b, int64_t lengthB, int32_t options);
+NLSSM_API int64_t NLSStringEqualsC(const NLSSMHandle *handle, const uint8_t *a, int64_t lengthA,
+                                   const uint8_t *b, int64_t lengthB, int32_t options);
+NLSSM_API int64_t NLSStringEquals_MBCS_modal(const NLSSMHandle *handle, const NLSString *a,
+                                             const NLSString *b, int64_t count, int32_t options);
+NLSSM_API int64_t NLSStringEqualsS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                              int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                              int32_t options);
+NLSSM_API int64_t NLSStringEqualsC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                              int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                              int32_t options);
+NLSSM_API int64_t NLSStringEquals_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *a,
+                                                const NLSString *b, int64_t count, int32_t options);
+NLSSM_API int64_t NLSStringEqualsS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *a,
+                                                 int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                                 int32_t options);
+NLSSM_API int64_t NLSStringEqualsC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *a,
+                                                 int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                                 int32_t options);
+
+/* Inequality (slots 36, 61, 37, 62): the position of the first character of
+ * the string that is not one of the characters of the set, or -1 when there
+ * is none (an empty string gives -1). A null or unpositioned operand gives 0.
+ * Plain forms: the string from its current character, limited to `count`
+ * characters when positive; the set from its current character, limited to
+ * `setLength` characters when positive. S forms take byte lengths.
+ * SBCS: byte offsets; an empty set gives 0 for a non-empty string, and the S
+ * member gives 0 for a set length of 0. The other members walk characters of
+ * their class (UTF-8 on UTF-8 handles and UTF-EBCDIC on UTF-EBCDIC handles,
+ * WCS2 surrogate pairs, modal shift states, non-modal lead bytes as Equals)
+ * and answer character positions; a character is in the set when the set
+ * holds the same bytes in the same shift mode. UTF-8 positions count the
+ * bytes that can start a character (00-7F, C2-F4).
+ * Lit forms: the set is a literal in encoding 62, converted through the
+ * handle's charConverter and passed whole to the handle's NotEqual or
+ * NotEqualS slot; `options` is reserved and ignored. When the converted set
+ * cannot be had (no work buffer, conversion failure) the result is
+ * NLSSM_COUNT_NO_MEMORY. */
+NLSSM_API int64_t NLSStringNotEqual_SBCS(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t count, const NLSString *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualS_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                          int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqual_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t count, const NLSString *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualS_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                          int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqual_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t count, const NLSString *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualS_MBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                          int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqual_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t count, const NLSString *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualS_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                          int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqual_MBCS_modal(const NLSSMHandle *handle, const NLSString *string,
+                                               int64_t count, const NLSString *set,
+                                               int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                                int64_t length, const uint8_t *set,
+                                                int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualLit(const NLSSMHandle *handle, const NLSString *string,
+                                       int64_t count, const uint8_t *literal, int64_t literalLength,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringNotEqualLitS(const NLSSMHandle *handle, const uint8_t *string,
+                                        int64_t length, const uint8_t *literal,
+                                        int64_t literalLength, uint32_t options);
+
+/* Ordering (slots 24, 25, 56, 108, 23, 57, 109). A binary comparison of
+ * bytes or code units, optionally folded to one case. Result: 0 when equal,
+ * k + 1 when the first operand is greater, -(k + 1) when it is smaller; k is
+ * the byte offset from each operand's start at which the order was decided:
+ * the first differing byte, the start of the deciding unit (WCS) or, when
+ * folding UTF-8/UTF-EBCDIC, of the deciding character; where one operand ends,
+ * its length. A null or unpositioned operand gives 0 (with pad an operand
+ * without current character is empty).
+ * Options: bit 1 pads the shorter operand with blanks (the rest of the
+ * longer one decides at its first non-blank, against the blank); bit 2 folds
+ * through lowerTable (Unicode members: the owner's lower-case mapping); bit 4
+ * through upperTable (upper-case mapping) when bit 2 is clear.
+ * SBCS: a positive count limits both operands to count bytes when it does not
+ * exceed the shorter one; at a folded difference the raw bytes decide.
+ * NLSStringCompare_SBCS starts at each operand's charIndex; without folding
+ * and with pad its blank is 0x20 (ASCII sets) or 0x40 (EBCDIC), and in EBCDIC
+ * a difference in the common part gives just 1 or -1.
+ * Other classes: a positive count takes the first count characters of each
+ * operand. Multi-byte sets fold single-byte characters only (the bytes
+ * decide); modal descriptors start in the shift state of their charKind and
+ * shift sequences are passed over in the blank tail. UTF-8 and UTF-EBCDIC
+ * compare bytes (ASCII folded by its letters, other characters through the
+ * owner's query; folded values decide). WCS members compare unsigned units in
+ * their byte order; a WCS2 high surrogate equal in both is taken with the
+ * unit after it (joined, high unit above), and folded values decide.
+ * C forms take lengths in characters (no byte limit is checked); null
+ * buffers give 0. The class-1 C member reads UTF-EBCDIC on UTF-EBCDIC handles.
+ * Lit forms: the literal (encoding 62) is converted through charConverter
+ * (2048 bytes on the stack, else the handle's pool) and compared through the
+ * CompStr, CompareS or CompStrC member with the literal length as the count
+ * (plain form) or the character length (C form), so a plain-form literal is
+ * compared with as many characters of A. A null or empty literal gives 0; no
+ * work buffer or a failed conversion gives NLSSM_COUNT_NO_MEMORY. */
+NLSSM_API int64_t NLSStringCompStr_SBCS(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_SBCS(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_UTF8(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_UTF8(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_UTF8(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_UTF8(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_UTFE(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_UTFE(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_UTFE(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_WCS2L(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_WCS2L(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_WCS2L(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_WCS2L(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_WCS2B(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_WCS2B(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_WCS2B(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_WCS2B(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_WCS4L(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_WCS4L(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_WCS4L(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_WCS4L(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_WCS4B(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_WCS4B(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_WCS4B(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_WCS4B(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_MBCS_modal(const NLSSMHandle *handle, const NLSString *a,
+                                              const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_MBCS_modal(const NLSSMHandle *handle, const NLSString *a,
+                                              const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                               int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                               uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                               int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                               uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *a,
+                                                 const NLSString *b, int64_t count,
+                                                 uint32_t options);
+NLSSM_API int64_t NLSStringCompare_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *a,
+                                                 const NLSString *b, int64_t count,
+                                                 uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *a,
+                                                  int64_t lengthA, const uint8_t *b,
+                                                  int64_t lengthB, uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *a,
+                                                  int64_t lengthA, const uint8_t *b,
+                                                  int64_t lengthB, uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                        const NLSString *a, const NLSString *b,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                        const NLSString *a, const NLSString *b,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                         const uint8_t *a, int64_t lengthA,
+                                                         const uint8_t *b, int64_t lengthB,
+                                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                         const uint8_t *a, int64_t lengthA,
+                                                         const uint8_t *b, int64_t lengthB,
+                                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                        const NLSString *a, const NLSString *b,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                        const NLSString *a, const NLSString *b,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                         const uint8_t *a, int64_t lengthA,
+                                                         const uint8_t *b, int64_t lengthB,
+                                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                         const uint8_t *a, int64_t lengthA,
+                                                         const uint8_t *b, int64_t lengthB,
+                                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                         const NLSString *a, const NLSString *b,
+                                                         int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                         const NLSString *a, const NLSString *b,
+                                                         int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                          const uint8_t *a, int64_t lengthA,
+                                                          const uint8_t *b, int64_t lengthB,
+                                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                          const uint8_t *a, int64_t lengthA,
+                                                          const uint8_t *b, int64_t lengthB,
+                                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompLit(const NLSSMHandle *handle, const NLSString *a,
+                                   const uint8_t *literal, int64_t literalLength, uint32_t options);
+NLSSM_API int64_t NLSStringCompLitS(const NLSSMHandle *handle, const uint8_t *a, int64_t lengthA,
+                                    const uint8_t *literal, int64_t literalLength,
+                                    uint32_t options);
+NLSSM_API int64_t NLSStringCompLitC(const NLSSMHandle *handle, const uint8_t *a, int64_t lengthA,
+                                    const uint8_t *literal, int64_t literalLength,
+                                    uint32_t options);
+NLSSM_API int64_t NLSStringCompLit_SBCS(const NLSSMHandle *handle, const NLSString *a,
+                                        const uint8_t *literal, int64_t literalLength,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringCompLitS_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *literal,
+                                         int64_t literalLength, uint32_t options);
+NLSSM_API int64_t NLSStringCompLitC_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *literal,
+                                         int64_t literalLength, uint32_t options);
+NLSSM_API int64_t NLSStringCompLit_MBCS_modal(const NLSSMHandle *handle, const NLSString *a,
+                                              const uint8_t *literal, int64_t literalLength,
+                                              uint32_t options);
+NLSSM_API int64_t NLSStringCompLitS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                               int64_t lengthA, const uint8_t *literal,
+                                               int64_t literalLength, uint32_t options);
+NLSSM_API int64_t NLSStringCompLitC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                               int64_t lengthA, const uint8_t *literal,
+                                               int64_t literalLength, uint32_t options);
+
 
 /* ---- Searching, classification and LIKE ----------------------------------- */
 /* Searches. Positions are 0-based and count characters from where the

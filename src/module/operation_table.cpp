@@ -77,6 +77,10 @@ const std::array kRows = {
          dbcs(op(&NLSStringIndex_MBCS_nonmodal), op(&NLSStringIndex_MBCS_nonmodal_EUC_JP),
               op(&NLSStringIndex_MBCS_nonmodal_EUC_TW),
               op(&NLSStringIndex_MBCS_nonmodal_GB18030))}},
+    Row{10,  // NLSStringEquals
+        {same(op(&NLSStringEquals_SBCS)), utf(op(&NLSStringEquals_UTF8), nullptr),
+         same(op(&NLSStringEquals)), same(op(&NLSStringEquals)),
+         same(op(&NLSStringEquals_MBCS_modal)), same(op(&NLSStringEquals_MBCS_nonmodal))}},
     every_class(14, op(&NLSStringInit)),
     Row{15,
         {same(op(&NLSCharInit_SBCS)), same(op(&NLSCharInit)), same(op(&NLSCharInit)),
@@ -97,6 +101,28 @@ const std::array kRows = {
               op(&stringNextChar_MBCS_nonmodal_EUC_TW),
               op(&stringNextChar_MBCS_nonmodal_GB18030))}},
     every_class(21, op(&stringNextCharB)),
+    Row{23,  // NLSStringCompLit
+        {same(op(&NLSStringCompLit_SBCS)), same(op(&NLSStringCompLit)), same(op(&NLSStringCompLit)),
+         same(op(&NLSStringCompLit)), same(op(&NLSStringCompLit_MBCS_modal)),
+         same(op(&NLSStringCompLit))}},
+    Row{24,  // NLSStringCompStr
+        {same(op(&NLSStringCompStr_SBCS)),
+         utf(op(&NLSStringCompStr_UTF8), op(&NLSStringCompStr_UTFE)),
+         endian(op(&NLSStringCompStr_WCS2L), op(&NLSStringCompStr_WCS2B)),
+         endian(op(&NLSStringCompStr_WCS4L), op(&NLSStringCompStr_WCS4B)),
+         same(op(&NLSStringCompStr_MBCS_modal)),
+         dbcs(op(&NLSStringCompStr_MBCS_nonmodal), op(&NLSStringCompStr_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringCompStr_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringCompStr_MBCS_nonmodal_GB18030))}},
+    Row{25,  // NLSStringCompare
+        {same(op(&NLSStringCompare_SBCS)),
+         utf(op(&NLSStringCompare_UTF8), op(&NLSStringCompare_UTFE)),
+         endian(op(&NLSStringCompare_WCS2L), op(&NLSStringCompare_WCS2B)),
+         endian(op(&NLSStringCompare_WCS4L), op(&NLSStringCompare_WCS4B)),
+         same(op(&NLSStringCompare_MBCS_modal)),
+         dbcs(op(&NLSStringCompare_MBCS_nonmodal), op(&NLSStringCompare_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringCompare_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringCompare_MBCS_nonmodal_GB18030))}},
     Row{26,  // stringCurCharSize
         {same(op(&stringCurCharSize_FixedSize)), same(op(&stringCurCharSize_UTF8)),
          same(op(&stringCurCharSize_WCS2)), same(op(&stringCurCharSize_FixedSize)),
@@ -154,6 +180,11 @@ const std::array kRows = {
          same(op(&NLSStringDelete_WCS4)), same(op(&NLSStringDelete_MBCS_modal)),
          same(op(&NLSStringDelete_MBCS))}},
     every_class(35, op(&NLSStringDeleteLit)),
+    Row{36,  // NLSStringNotEqual
+        {same(op(&NLSStringNotEqual_SBCS)), same(op(&NLSStringNotEqual_UTF8)),
+         same(op(&NLSStringNotEqual_MBCS)), same(op(&NLSStringNotEqual_WCS4)),
+         same(op(&NLSStringNotEqual_MBCS_modal)), same(op(&NLSStringNotEqual_MBCS))}},
+    every_class(37, op(&NLSStringNotEqualLit)),
     Row{38,  // NLSStringSubStr
         {same(op(&NLSStringSubStr_SBCS)), same(op(&NLSStringSubStr_MBCS_UTF8)),
          same(op(&NLSStringSubStr_WCS2)), same(op(&NLSStringSubStr_WCS4)),
@@ -219,6 +250,23 @@ const std::array kRows = {
          dbcs(op(&NLSStringIndexS_MBCS_nonmodal), op(&NLSStringIndexS_MBCS_nonmodal_EUC_JP),
               op(&NLSStringIndexS_MBCS_nonmodal_EUC_TW),
               op(&NLSStringIndexS_MBCS_nonmodal_GB18030))}},
+    Row{52,  // NLSStringEqualsS
+        {same(op(&NLSStringEqualsS_SBCS)), utf(op(&NLSStringEqualsS_UTF8), nullptr),
+         same(op(&NLSStringEqualsS)), same(op(&NLSStringEqualsS)),
+         same(op(&NLSStringEqualsS_MBCS_modal)), same(op(&NLSStringEqualsS_MBCS_nonmodal))}},
+    Row{56,  // NLSStringCompareS
+        {same(op(&NLSStringCompareS_SBCS)),
+         utf(op(&NLSStringCompareS_UTF8), op(&NLSStringCompareS_UTFE)),
+         endian(op(&NLSStringCompareS_WCS2L), op(&NLSStringCompareS_WCS2B)),
+         endian(op(&NLSStringCompareS_WCS4L), op(&NLSStringCompareS_WCS4B)),
+         same(op(&NLSStringCompareS_MBCS_modal)),
+         dbcs(op(&NLSStringCompareS_MBCS_nonmodal), op(&NLSStringCompareS_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringCompareS_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringCompareS_MBCS_nonmodal_GB18030))}},
+    Row{57,  // NLSStringCompLitS
+        {same(op(&NLSStringCompLitS_SBCS)), same(op(&NLSStringCompLitS)),
+         same(op(&NLSStringCompLitS)), same(op(&NLSStringCompLitS)),
+         same(op(&NLSStringCompLitS_MBCS_modal)), same(op(&NLSStringCompLitS))}},
     Row{58,  // NLSStringReverseS
         {same(op(&NLSStringReverseS_SBCS)), same(op(&NLSStringReverseS_MBCS)),
          same(op(&NLSStringReverseS_WCS2)), same(op(&NLSStringReverseS_WCS4)),
@@ -229,6 +277,11 @@ const std::array kRows = {
          same(op(&NLSStringDeleteS_WCS4)), same(op(&NLSStringDeleteS_MBCS_modal)),
          same(op(&NLSStringDeleteS_MBCS))}},
     every_class(60, op(&NLSStringDeleteLitS)),
+    Row{61,  // NLSStringNotEqualS
+        {same(op(&NLSStringNotEqualS_SBCS)), same(op(&NLSStringNotEqualS_UTF8)),
+         same(op(&NLSStringNotEqualS_MBCS)), same(op(&NLSStringNotEqualS_WCS4)),
+         same(op(&NLSStringNotEqualS_MBCS_modal)), same(op(&NLSStringNotEqualS_MBCS))}},
+    every_class(62, op(&NLSStringNotEqualLitS)),
     Row{63,  // NLSStringMoveS
         {same(op(&NLSStringMoveS_SBCS)), same(op(&NLSStringMoveS_MBCS_UTF8)),
          same(op(&NLSStringMoveS_WCS2)), same(op(&NLSStringMoveS_WCS4)),
@@ -373,6 +426,22 @@ const std::array kRows = {
          dbcs(op(&NLSStringIndexC_MBCS_nonmodal), op(&NLSStringIndexC_MBCS_nonmodal_EUC_JP),
               op(&NLSStringIndexC_MBCS_nonmodal_EUC_TW),
               op(&NLSStringIndexC_MBCS_nonmodal_GB18030))}},
+    Row{105,  // NLSStringEqualsC
+        {same(op(&NLSStringEqualsC_SBCS)), same(op(&NLSStringEqualsC_UTF8)),
+         same(op(&NLSStringEqualsC)), same(op(&NLSStringEqualsC)),
+         same(op(&NLSStringEqualsC_MBCS_modal)), same(op(&NLSStringEqualsC_MBCS_nonmodal))}},
+    Row{108,  // NLSStringCompStrC
+        {same(op(&NLSStringCompStrC_SBCS)), same(op(&NLSStringCompStrC_UTF8)),
+         endian(op(&NLSStringCompStrC_WCS2L), op(&NLSStringCompStrC_WCS2B)),
+         endian(op(&NLSStringCompStrC_WCS4L), op(&NLSStringCompStrC_WCS4B)),
+         same(op(&NLSStringCompStrC_MBCS_modal)),
+         dbcs(op(&NLSStringCompStrC_MBCS_nonmodal), op(&NLSStringCompStrC_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringCompStrC_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringCompStrC_MBCS_nonmodal_GB18030))}},
+    Row{109,  // NLSStringCompLitC
+        {same(op(&NLSStringCompLitC_SBCS)), same(op(&NLSStringCompLitC)),
+         same(op(&NLSStringCompLitC)), same(op(&NLSStringCompLitC)),
+         same(op(&NLSStringCompLitC_MBCS_modal)), same(op(&NLSStringCompLitC))}},
     Row{110,  // NLSStringStripC
         {same(op(&NLSStringStripC_SBCS)), same(op(&NLSStringStripC_UTF8)),
          same(op(&NLSStringStripC_WCS2)), same(op(&NLSStringStripC_WCS4)),
