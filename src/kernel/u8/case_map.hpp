@@ -29,6 +29,18 @@ inline uint8_t ascii_case(CaseKind kind, uint8_t b) {
   return (b >= 'A' && b <= 'Z') ? static_cast<uint8_t>(b + 32) : b;
 }
 
+// Eight ASCII bytes mapped at once: adding 0x80 - first to each byte sets
+// its bit 7 from `first` up, and adding 0x80 - last - 1 from past `last`, so
+// bit 7 of the difference marks the letters whose bit 5 flips. No byte
+// carries into the next since each is below 0x80.
+inline uint64_t ascii_case_word(CaseKind kind, uint64_t w) {
+  constexpr uint64_t kOnes = 0x0101010101010101ull;
+  const uint64_t first = kind == CaseKind::upper ? 'a' : 'A';
+  const uint64_t from = w + kOnes * (0x80 - first);
+  const uint64_t past = w + kOnes * (0x80 - first - 26);
+  return w ^ (((from & ~past) & (kOnes * 0x80)) >> 2);
+}
+
 // The text that the character at p (n bytes available) maps to, in out
 // (kCaseFullMax bytes at least). An ill-formed stretch maps to itself.
 struct Mapped {

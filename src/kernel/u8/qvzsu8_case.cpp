@@ -27,6 +27,16 @@ int64_t map_text(CaseKind kind, uint8_t *dst, int64_t capacity, const uint8_t *s
   bool illFormed = false;
   uint8_t piece[kernel::u8::kCaseFullMax];
   for (int64_t in = 0; in < byteLength;) {
+    if (fits && in + 8 <= byteLength && out + 8 <= capacity && kernel::u8::ascii_word(src + in)) {
+      uint64_t w;
+      std::memcpy(&w, src + in, 8);
+      w = kernel::u8::ascii_case_word(kind, w);
+      std::memcpy(dst + out, &w, 8);
+      in += 8;
+      out += 8;
+      total += 8;
+      continue;
+    }
     if (fits && src[in] < 0x80 && out < capacity) {  // ASCII maps in place, one byte to one
       dst[out++] = kernel::u8::ascii_case(kind, src[in++]);
       ++total;
