@@ -994,7 +994,7 @@ NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string
 /* The length of the longest well-formed start of the text: byteLength when
  * the whole text is well formed, else the offset of the first byte of the
  * first ill-formed sequence (a sequence cut short by the end of the text is
- * ill formed). -1 for a negative length or a null text. */
+ * ill formed). -1 for a negative length, or a null text that has bytes. */
 NLSSM_API int64_t qvzsu8Validate(const uint8_t *text, int64_t byteLength);
 /* The number of characters in the text. -1 for bad arguments. */
 NLSSM_API int64_t qvzsu8Length(const uint8_t *text, int64_t byteLength);
