@@ -981,6 +981,76 @@ NLSSM_API int64_t ToUTFE(const NLSSMHandle *handle, uint32_t codePoint, uint8_t 
 NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string, int64_t count,
                               int64_t reserved, int64_t *byteCount, uint32_t *state);
 
+/* ---- UTF-8 toolkit ---- */
+/* Standalone UTF-8 string functions over (text, byteLength) pairs; a text
+ * may be null only when its length is 0. Text is judged by Unicode's rule
+ * for well-formed UTF-8 (no overlong forms, surrogates or code points above
+ * U+10FFFF). An ill-formed stretch counts as one character: its maximal
+ * subpart, the longest start of a well-formed sequence that it is, or a
+ * single byte when its first byte starts none (the bytes a decoder replaces
+ * by one U+FFFD). u8Length and qvzsu8ByteLength (above, with the counting
+ * members) instead trust each first byte. */
+
+/* The length of the longest well-formed start of the text: byteLength when
+ * the whole text is well formed, else the offset of the first byte of the
+ * first ill-formed sequence (a sequence cut short by the end of the text is
+ * ill formed). -1 for a negative length, or a null text that has bytes. */
+NLSSM_API int64_t qvzsu8Validate(const uint8_t *text, int64_t byteLength);
+/* The number of characters in the text. -1 for bad arguments. */
+NLSSM_API int64_t qvzsu8Length(const uint8_t *text, int64_t byteLength);
+/* The byte offset of character charIndex (0-based); byteLength when
+ * charIndex is the number of characters; -1 when it is more, negative, or
+ * the arguments are bad. */
+NLSSM_API int64_t qvzsu8Offset(const uint8_t *text, int64_t byteLength, int64_t charIndex);
+
+/* Options of the case mappings: the full mappings (one character to up to
+ * three: U+00DF to "SS" in upper case and "ss" folded, U+0130 to "i" and
+ * U+0307 in lower case), rather than the simple one-to-one mappings. */
+#define QVZSU8_FULL 1u
+/* Upper case, lower case and case folding of src into dst. Mappings are
+ * those of the Unicode character database without language or context
+ * (final sigma is not treated apart). The destination must not overlap the
+ * source. A character's mapping is stored whole or not at all; once one
+ * does not fit, nothing more is stored. *written (if not null) gets the
+ * bytes stored; *needed (if not null) the bytes the whole mapping takes, so
+ * *needed - byteLength is the change in length, and dst may be null with
+ * capacity 0 to ask for it. Ill-formed stretches are copied unchanged.
+ * Returns 0; 0x803fe807 when the mapping did not fit; 0x803fe808 when it
+ * fitted but the source holds ill-formed UTF-8; 0x803fe818 for a negative
+ * capacity or length; 0x803fe82a for a null src or dst that has bytes;
+ * 0x803fe82e for options other than QVZSU8_FULL. */
+NLSSM_API int64_t qvzsu8Upper(uint8_t *dst, int64_t capacity, const uint8_t *src,
+                              int64_t byteLength, uint32_t options, int64_t *written,
+                              int64_t *needed);
+NLSSM_API int64_t qvzsu8Lower(uint8_t *dst, int64_t capacity, const uint8_t *src,
+                              int64_t byteLength, uint32_t options, int64_t *written,
+                              int64_t *needed);
+NLSSM_API int64_t qvzsu8Fold(uint8_t *dst, int64_t capacity, const uint8_t *src, int64_t byteLength,
+                             uint32_t options, int64_t *written, int64_t *needed);
+/* The simple upper-case, lower-case and folded form of one code point;
+ * code points without one (and values that are not code points) map to
+ * themselves. */
+NLSSM_API uint32_t qvzsu8UpperChar(uint32_t codePoint);
+NLSSM_API uint32_t qvzsu8LowerChar(uint32_t codePoint);
+NLSSM_API uint32_t qvzsu8FoldChar(uint32_t codePoint);
+
+/* Order of two texts: -1, 0 or 1. qvzsu8Compare orders the bytes, which for
+ * well-formed UTF-8 is code point order, and a text before any longer text
+ * it begins. qvzsu8CaseCompare orders the texts' full case foldings the
+ * same way, so "STRASSE", "strasse" and "stra" U+00DF "e" are equal; ill-formed
+ * stretches compare as their bytes. A null text or a negative length counts
+ * as empty. */
+NLSSM_API int64_t qvzsu8Compare(const uint8_t *a, int64_t aLength, const uint8_t *b,
+                                int64_t bLength);
+NLSSM_API int64_t qvzsu8CaseCompare(const uint8_t *a, int64_t aLength, const uint8_t *b,
+                                    int64_t bLength);
+/* The byte offset of the first occurrence of pattern in text, 0 for an
+ * empty pattern, -1 when there is none or the arguments are bad. Matching
+ * is binary; a well-formed pattern only matches at character boundaries of
+ * well-formed text. */
+NLSSM_API int64_t qvzsu8Find(const uint8_t *text, int64_t byteLength, const uint8_t *pattern,
+                             int64_t patternLength);
+
 /* ---- Case mapping and normalization --------------------------------------- */
 
 /* ---- Equality, inequality and ordering comparison ------------------------- */
