@@ -1,0 +1,93 @@
+// Fuzzes character stepping, positioning and counting on handles of every
+// class: a walk with stringNextChar visits strictly increasing offsets inside
+// the text, and as many characters as the counting slot reports; positions
+// and lengths stay inside the text; blank padding stays inside its room.
+#include "fuzz_support.hpp"
+
+using namespace fuzz_support;
+
+namespace {
+
+using NextFn = int64_t (*)(const NLSSMHandle *, NLSString *);
+using SizeFn = int64_t (*)(const NLSSMHandle *, const NLSString *);
+using NumCharsFn = int64_t (*)(const NLSSMHandle *, const NLSString *, int64_t, int64_t *);
+using ByteLengthFn = int64_t (*)(const NLSSMHandle *, const NLSString *, int64_t);
+using ByteLengthCFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, int64_t);
+using LengthFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t *, int64_t *, int64_t);
+using NLengthFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, int64_t *, int64_t *);
+using BLengthFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t);
+using BlankPadSFn = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t, int64_t, int64_t *);
+using AllBlanksSFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t);
+
+// Walks the whole text from its first character; answers the characters seen.
+int64_t walk(const NLSSMHandle *h, const Text &t) {
+  NLSString s = over(h, t.data(), t.size, t.size, 0);
+  if (t.size == 0) return 0;
+  int64_t seen = 0, last = -1;
+  while (s.curOffset != NLSSM_POS_NONE) {
+    FUZZ_CHECK(s.curOffset > last && s.curOffset < t.size);
+    FUZZ_CHECK(s.charIndex == seen);
+    const int64_t size = slot<SizeFn>(h->stringCurCharSize)(h, &s);
+    FUZZ_CHECK(size >= 1 && size <= t.size);
+    last = s.curOffset;
+    ++seen;
+    FUZZ_CHECK(seen <= t.size);
+    const int64_t next = slot<NextFn>(h->stringNextChar)(h, &s);
+    FUZZ_CHECK(next == NLSSM_POS_NONE || next == seen);
+    if (next == NLSSM_POS_NONE) break;
+  }
+  return seen;
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
+  FuzzedDataProvider in(data, size);
+  const NLSSMHandle *h = pick_handle(in);
+  const int64_t pos = in.ConsumeIntegralInRange<int64_t>(-2, 40);
+  const int64_t pad = in.ConsumeIntegralInRange<int64_t>(0, 80);
+  const Text t = take_text(in, 256);
+  {
+    FaultWindow faults(in);
+    int64_t count = -1;
+    const int64_t st = slot<NumCharsSFn>(h->NLSNumCharsS)(h, t.data(), t.size, 0, &count);
+    FUZZ_CHECK(one_of(st, {NLSSM_OK, NLSSM_E_BAD_CHARACTER}));
+    FUZZ_CHECK(count >= 0 && count <= t.size);
+    if (st == NLSSM_OK) FUZZ_CHECK(walk(h, t) == count);
+
+    NLSString s = over(h, t.data(), t.size, t.size, 0);
+    int64_t described = -1;
+    if (slot<NumCharsFn>(h->NLSNumChars)(h, &s, 0, &described) == NLSSM_OK)
+      FUZZ_CHECK(described == count);
+    const int64_t bytes = slot<ByteLengthFn>(h->NLSStringByteLength)(h, &s, pos);
+    FUZZ_CHECK(bytes >= 0 && bytes <= t.size);
+    const int64_t at = slot<SetPosFn>(h->stringSetPos)(h, &s, pos, 0);
+    FUZZ_CHECK(at == pos || at == NLSSM_POS_OUTSIDE);
+    if (at == pos && pos >= 0) FUZZ_CHECK(s.curOffset >= 0 && s.curOffset < t.size);
+    const int64_t c_bytes = slot<ByteLengthCFn>(h->NLSStringByteLengthC)(h, t.data(), t.size, 0);
+    FUZZ_CHECK(c_bytes >= 0 && c_bytes <= t.size);
+
+    // Zero-terminated forms: the text with a terminating zero unit.
+    std::vector<uint8_t> z(t.data(), t.data() + t.size);
+    z.insert(z.end(), 4, 0);
+    const Text zt(z);
+    int64_t zchars = -1, zbytes = -1;
+    slot<LengthFn>(h->NLSStringLength)(h, zt.data(), &zchars, &zbytes, 0);
+    FUZZ_CHECK(zbytes >= 0 && zbytes <= t.size && zchars >= 0 && zchars <= zbytes);
+    int64_t nchars = -1, nbytes = -1;
+    slot<NLengthFn>(h->NLSStringNLength)(h, zt.data(), pos, &nchars, &nbytes);
+    FUZZ_CHECK(nbytes >= 0 && nbytes <= zbytes && nchars >= 0 && nchars <= nbytes);
+    const int64_t whole = slot<BLengthFn>(h->NLSStringBLength)(h, zt.data(), -1);
+    FUZZ_CHECK(whole >= 0 && whole <= t.size);
+
+    Dest d(pad, std::vector<uint8_t>(t.data(), t.data() + t.size));
+    int64_t padded = -1;
+    const int64_t pst = slot<BlankPadSFn>(h->NLSBlankPadS)(h, d.data(), pad, 0, &padded);
+    FUZZ_CHECK(one_of(pst, {NLSSM_OK, NLSSM_E_DEST_TOO_SMALL}) && d.intact());
+    FUZZ_CHECK(padded >= 0 && padded <= pad);
+    const int64_t blank = slot<AllBlanksSFn>(h->NLSAllBlanksS)(h, t.data(), t.size);
+    FUZZ_CHECK(blank == 0 || blank == 1);
+  }
+  check_pools();
+  return 0;
+}
