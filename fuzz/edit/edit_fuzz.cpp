@@ -82,8 +82,11 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
 
     const int64_t strip_s = slot<StripSFn>(h->NLSStringStripS)(h, text.data(), text.size, flags);
     FUZZ_CHECK(strip_s >= 0 && strip_s <= text.size);
-    const int64_t strip_c = slot<StripSFn>(h->NLSStringStripC)(h, text.data(), chars, flags);
-    FUZZ_CHECK(strip_c >= 0 && strip_c <= chars);
+    if (const int64_t whole = whole_chars(h, text.data(), text.size); whole >= 0) {
+      const Text c = for_c_form(text);
+      const int64_t strip_c = slot<StripSFn>(h->NLSStringStripC)(h, c.data(), whole, flags);
+      FUZZ_CHECK(strip_c >= 0 && strip_c <= whole);
+    }
     const int64_t strip = slot<StripFn>(h->NLSStringStrip)(h, &src, n, flags);
     FUZZ_CHECK(strip >= 0 && strip <= chars);
   }

@@ -51,7 +51,6 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   const std::vector<uint8_t> old = in.ConsumeBytes<uint8_t>(room);
   {
     FaultWindow faults(in);
-    const int64_t chars = chars_in(h, text.data(), text.size);
     int64_t written = -1, chars_written = -1;
 
     Dest m(room, old);
@@ -59,15 +58,17 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
                                                         &written, flags);
     FUZZ_CHECK(one_of(ms, kCopyStatuses) && m.intact());
     check_written(written, room);
-    Dest mc(room, old);
-    written = -1;
-    const int64_t mcs =
-        slot<MoveCFn>(h->NLSStringMoveC)(h, text.data(), chars, mc.data(), room, &written,
-                                         &chars_written, flags | NLSSM_EDIT_SOURCE_IN_CHARS);
-    FUZZ_CHECK(one_of(mcs, kCopyStatuses) && mc.intact());
-    check_written(written, room);
-    FUZZ_CHECK(chars_written >= 0 && chars_written <= std::max(chars, room));
-
+    if (const int64_t whole = whole_chars(h, text.data(), text.size); whole >= 0) {
+      const Text c = for_c_form(text);
+      Dest mc(room, old);
+      written = -1;
+      const int64_t mcs =
+          slot<MoveCFn>(h->NLSStringMoveC)(h, c.data(), whole, mc.data(), room, &written,
+                                           &chars_written, flags | NLSSM_EDIT_SOURCE_IN_CHARS);
+      FUZZ_CHECK(one_of(mcs, kCopyStatuses) && mc.intact());
+      check_written(written, room);
+      FUZZ_CHECK(chars_written >= 0 && chars_written <= std::max(whole, room));
+    }
     Dest f(room, old);
     written = -1;
     const int64_t fs =
@@ -106,15 +107,16 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
     FUZZ_CHECK(one_of(js, {NLSSM_OK, NLSSM_E_BAD_ALIGNMENT}) && j.intact());
     if (js == NLSSM_OK)
       FUZZ_CHECK(text_length >= 0 && start >= 0 && start + text_length <= text.size);
-    Dest jc(text.size, field);
-    int64_t bytes = -1, cchars = -1, start_bytes = -1, start_chars = -1;
-    const int64_t jcs = slot<JustifyCFn>(h->NLSStringJustifyC)(h, jc.data(), chars, align, &bytes,
-                                                               &cchars, &start_bytes, &start_chars);
-    FUZZ_CHECK(one_of(jcs, {NLSSM_OK, NLSSM_E_BAD_ALIGNMENT}) && jc.intact());
-    if (jcs == NLSSM_OK)
-      FUZZ_CHECK(bytes >= 0 && start_bytes >= 0 && start_bytes + bytes <= text.size &&
-                 cchars >= 0 && start_chars >= 0 && start_chars + cchars <= chars);
-
+    if (const int64_t whole = whole_chars(h, text.data(), text.size); whole >= 0) {
+      Dest jc(text.size, field);
+      int64_t bytes = -1, cchars = -1, start_bytes = -1, start_chars = -1;
+      const int64_t jcs = slot<JustifyCFn>(h->NLSStringJustifyC)(
+          h, jc.data(), whole, align, &bytes, &cchars, &start_bytes, &start_chars);
+      FUZZ_CHECK(one_of(jcs, {NLSSM_OK, NLSSM_E_BAD_ALIGNMENT}) && jc.intact());
+      if (jcs == NLSSM_OK)
+        FUZZ_CHECK(bytes >= 0 && start_bytes >= 0 && start_bytes + bytes <= text.size &&
+                   cchars >= 0 && start_chars >= 0 && start_chars + cchars <= whole);
+    }
     Dest q(room, old);
     int64_t result = 0;
     const int64_t qs =

@@ -21,13 +21,17 @@
 
 namespace fuzz_support {
 
+// The encoding of the input being run, for the failure message.
+inline int current_encoding = -1;
+
 // Abort with a line saying what failed; libFuzzer keeps the input.
-#define FUZZ_CHECK(cond)                                                            \
-  do {                                                                              \
-    if (!(cond)) {                                                                  \
-      std::fprintf(stderr, "%s:%d: check failed: %s\n", __FILE__, __LINE__, #cond); \
-      std::abort();                                                                 \
-    }                                                                               \
+#define FUZZ_CHECK(cond)                                                                  \
+  do {                                                                                    \
+    if (!(cond)) {                                                                        \
+      std::fprintf(stderr, "%s:%d: check failed (encoding %d): %s\n", __FILE__, __LINE__, \
+                   fuzz_support::current_encoding, #cond);                                \
+      std::abort();                                                                       \
+    }                                                                                     \
   } while (0)
 
 // Latin-1, EBCDIC 37, UTF-8, UTF-EBCDIC, UTF-16 LE and BE, UTF-32 BE, the
@@ -58,7 +62,9 @@ inline Host &host() {
 }
 
 inline const NLSSMHandle *pick_handle(FuzzedDataProvider &in) {
-  return host().handles[in.ConsumeIntegralInRange<size_t>(0, kEncodingCount - 1)];
+  const size_t i = in.ConsumeIntegralInRange<size_t>(0, kEncodingCount - 1);
+  current_encoding = kEncodings[i];
+  return host().handles[i];
 }
 
 // Sometimes makes one of the next few pool allocations fail, so that the
@@ -139,7 +145,13 @@ inline NLSString over(const NLSSMHandle *h, uint8_t *p, int64_t length, int64_t 
   s.prevOffset = NLSSM_POS_NO_PREVIOUS;
   if (length > 0 && at >= 0) {
     s.curOffset = 0;
-    slot<SetPosFn>(h->stringSetPos)(h, &s, at, 0);
+    if (slot<SetPosFn>(h->stringSetPos)(h, &s, at, 0) != at) {
+      // No such character: leave the descriptor unset rather than wherever
+      // the failed move left it.
+      s.charIndex = 0;
+      s.curOffset = s.nextOffset = NLSSM_POS_NONE;
+      s.prevOffset = NLSSM_POS_NO_PREVIOUS;
+    }
   }
   return s;
 }
@@ -149,12 +161,42 @@ inline NLSString over(const NLSSMHandle *h, const Text &t, FuzzedDataProvider &i
   return over(h, t.data(), t.size, t.size, in.ConsumeIntegralInRange<int64_t>(-1, 3));
 }
 
+// True when the text is whole characters of the handle's encoding: whole
+// units, and nothing the counting slot calls broken.
+inline bool well_formed(const NLSSMHandle *h, const uint8_t *p, int64_t n) {
+  int64_t count = 0;
+  return (h->unitWidth <= 1 || n % h->unitWidth == 0) &&
+         slot<NumCharsSFn>(h->NLSNumCharsS)(h, p, n, 0, &count) == NLSSM_OK;
+}
+
 // Characters in a raw buffer by the handle's counting slot (broken sequences
 // counted), or -1 when it fails.
 inline int64_t chars_in(const NLSSMHandle *h, const uint8_t *p, int64_t n) {
   int64_t count = 0;
   const int64_t st = slot<NumCharsSFn>(h->NLSNumCharsS)(h, p, n, 0, &count);
   return st == NLSSM_OK || st == NLSSM_E_BAD_CHARACTER ? count : -1;
+}
+
+// The characters a character-count (C) form may be given for a text: all
+// of them when the text is whole characters, else -1 (such a form reads
+// whole characters with no byte limit, so a text cut inside one is not a
+// valid argument).
+inline int64_t whole_chars(const NLSSMHandle *h, const uint8_t *p, int64_t n) {
+  return well_formed(h, p, n) ? chars_in(h, p, n) : -1;
+}
+
+// A copy of a text for the character-count forms: zero bytes after it, as
+// modal text's forms look at the bytes after the last character for a
+// shift-in that closes it.
+inline Text for_c_form(const Text &t) {
+  return Text(std::vector<uint8_t>(t.data(), t.data() + t.size), 4);
+}
+
+// Positions an answer may name in a raw buffer: its characters when it is
+// whole characters; otherwise (operations differ in how they cut malformed
+// text and trailing parts of units) at most one per byte.
+inline int64_t positions_in(const NLSSMHandle *h, const uint8_t *p, int64_t n) {
+  return well_formed(h, p, n) ? chars_in(h, p, n) : n;
 }
 
 }  // namespace fuzz_support
