@@ -30,7 +30,8 @@ int64_t walk(const NLSSMHandle *h, const Text &t) {
     FUZZ_CHECK(s.curOffset > last && s.curOffset < t.size);
     FUZZ_CHECK(s.charIndex == seen);
     const int64_t size = slot<SizeFn>(h->stringCurCharSize)(h, &s);
-    FUZZ_CHECK(size >= 1 && size <= t.size);
+    // The size a lead byte announces (UTF-8 and UTF-EBCDIC: up to six).
+    FUZZ_CHECK(size >= 1 && size <= 6);
     last = s.curOffset;
     ++seen;
     FUZZ_CHECK(seen <= t.size);
@@ -64,7 +65,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
 
     NLSString s = over(h, t.data(), t.size, t.size, 0);
     int64_t described = -1;
-    if (slot<NumCharsFn>(h->NLSNumChars)(h, &s, 0, &described) == NLSSM_OK)
+    if (s.curOffset == 0 && slot<NumCharsFn>(h->NLSNumChars)(h, &s, 0, &described) == NLSSM_OK)
       FUZZ_CHECK(described == count);
     const int64_t bytes = slot<ByteLengthFn>(h->NLSStringByteLength)(h, &s, pos);
     FUZZ_CHECK(bytes >= 0 && bytes <= t.size);
@@ -74,18 +75,23 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
     const int64_t c_bytes = slot<ByteLengthCFn>(h->NLSStringByteLengthC)(h, t.data(), t.size, 0);
     FUZZ_CHECK(c_bytes >= 0 && c_bytes <= t.size);
 
-    // Zero-terminated forms: the text and zero bytes that make a whole zero
-    // unit of any width after it, aligned or not.
-    constexpr int64_t kZeros = 8;
+    // Zero-terminated forms: the text, its last unit completed with zero
+    // bytes, and one zero unit; nothing may be read past it.
+    const int64_t width = std::max<int64_t>(h->unitWidth, 1);
+    const int64_t kZeros = (width - t.size % width) % width + width;
     std::vector<uint8_t> z(t.data(), t.data() + t.size);
-    z.insert(z.end(), kZeros, 0);
+    z.insert(z.end(), static_cast<size_t>(kZeros), 0);
     const Text zt(z);
     int64_t zchars = -1, zbytes = -1;
     slot<LengthFn>(h->NLSStringLength)(h, zt.data(), &zchars, &zbytes, 0);
     FUZZ_CHECK(zbytes >= 0 && zbytes <= t.size + kZeros && zchars >= 0 && zchars <= zbytes);
     int64_t nchars = -1, nbytes = -1;
     slot<NLengthFn>(h->NLSStringNLength)(h, zt.data(), pos, &nchars, &nbytes);
-    FUZZ_CHECK(nbytes >= 0 && nbytes <= zbytes && nchars >= 0 && nchars <= nbytes);
+    // The limited length keeps within its limit and the terminated text.
+    FUZZ_CHECK(nbytes >= 0 && nbytes <= std::max<int64_t>(pos, 0) && nbytes <= t.size + kZeros);
+    // (UTF-EBCDIC handles measure the limited length by the UTF-8 leads.)
+    FUZZ_CHECK(nchars >= 0 && nchars <= nbytes &&
+               (nchars <= zchars || h->encodingNumber == kUtfEbcdic));
     const int64_t whole = slot<BLengthFn>(h->NLSStringBLength)(h, zt.data(), -1);
     FUZZ_CHECK(whole >= 0 && whole <= t.size + kZeros);
 

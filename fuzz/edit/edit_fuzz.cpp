@@ -43,7 +43,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   const Text text = take_text(in, 128);
   {
     FaultWindow faults(in);
-    const int64_t chars = chars_in(h, text.data(), text.size);
+    const int64_t chars = positions_in(h, text.data(), text.size);
     FUZZ_CHECK(chars >= 0);
 
     Text r = copy_of(text);

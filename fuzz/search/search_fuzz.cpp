@@ -48,7 +48,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
     const int64_t s =
         slot<IndexSFn>(h->NLSStringIndexS)(h, text.data(), text.size, pattern.data(), pattern.size);
     check_position(s, units);
-    if (text.size > 0 && well_formed(h, text.data(), text.size))
+    if (units > 0 && well_formed(h, text.data(), text.size))
       FUZZ_CHECK(slot<IndexSFn>(h->NLSStringIndexS)(h, text.data(), text.size, text.data(),
                                                     text.size) == 0);
     const int64_t c = slot<ContainsFn>(h->NLSStringContains)(h, text.data(), text.size,

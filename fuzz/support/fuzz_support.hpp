@@ -164,6 +164,10 @@ inline NLSString over(const NLSSMHandle *h, const Text &t, FuzzedDataProvider &i
 // True when the text is whole characters of the handle's encoding: whole
 // units, and nothing the counting slot calls broken.
 inline bool well_formed(const NLSSMHandle *h, const uint8_t *p, int64_t n) {
+  // Class 1 counts by the lead bytes alone; other members check the bytes
+  // after them. UTF-8 is judged by Unicode's rule, UTF-EBCDIC only when empty.
+  if (h->encodingClass == NLSSM_CLASS_UTF8)
+    return n == 0 || (h->encodingNumber == NLSSM_ENC_UTF8 && qvzsu8Validate(p, n) == n);
   int64_t count = 0;
   return (h->unitWidth <= 1 || n % h->unitWidth == 0) &&
          slot<NumCharsSFn>(h->NLSNumCharsS)(h, p, n, 0, &count) == NLSSM_OK;
