@@ -120,6 +120,25 @@ const std::array kRows = {
          same(op(&NLSStringLength_MBCS_modal)),
          dbcs(op(&NLSStringLength_MBCS_nonmodal), op(&NLSStringLength_MBCS_EUC_JP),
               op(&NLSStringLength_MBCS_EUC_TW), op(&NLSStringLength_MBCS_GB18030))}},
+    Row{79,  // NLSGetBaseDirection
+        {same(op(&NLSGetBaseDirection_SBCS)),
+         utf(op(&NLSGetBaseDirection_UTF8), op(&NLSGetBaseDirection_UTFE)),
+         same(op(&NLSGetBaseDirection_WCS2)), same(op(&NLSGetBaseDirection_WCS4)),
+         same(op(&NLSGetBaseDirection_MBCS)), same(op(&NLSGetBaseDirection_MBCS))}},
+    Row{80,  // NLSVisualOrderFormat
+        {same(op(&NLSVisualOrderFormat_SBCS)),
+         same(op(&NLSVisualOrderFormat_UTF8)),
+         same(op(&NLSVisualOrderFormat_WCS2)),
+         same(op(&NLSVisualOrderFormat_WCS4)),
+         {},
+         {}}},
+    Row{81,  // NLSLogicalOrderFormat
+        {same(op(&NLSLogicalOrderFormat_SBCS)),
+         same(op(&NLSLogicalOrderFormat_UTF8)),
+         same(op(&NLSLogicalOrderFormat_WCS2)),
+         same(op(&NLSLogicalOrderFormat_WCS4)),
+         {},
+         {}}},
     Row{101,  // NLSStringNLength
         {same(op(&NLSStringNLength_SBCS)), same(op(&NLSStringNLength_UTF8)),
          same(op(&NLSStringNLength_WCS2)), same(op(&NLSStringNLength_WCS4)),

@@ -1,0 +1,401 @@
+// NLSVisualOrderFormat and NLSLogicalOrderFormat: one line of text put into
+// display order, or a displayed line back into reading order, in the
+// handle's own encoding. A text front end per class decodes characters and
+// gives their classes, paired brackets and mirror images; the level
+// resolution (uba.cpp) is the same for all.
+#include <nlssm/nlssm.h>
+
+#include <cstdint>
+#include <cstring>
+
+#include "bidi/host_classes.hpp"
+#include "bidi/pairs.hpp"
+#include "bidi/uba.hpp"
+#include "catalogue/catalogue.hpp"
+#include "module/work_buffer.hpp"
+#include "unicode/tables.hpp"
+
+namespace nlssm::bidi {
+namespace {
+
+constexpr uint32_t kReplacement = 0xFFFD;
+// Substitute word of a character: 0, a mirror image shown at odd levels, or
+// kAlways with the character that stands in for ill-formed input.
+constexpr uint32_t kAlways = 0x80000000u;
+
+struct Decoded {
+  uint32_t character;
+  int64_t size;
+  int64_t status;  // NLSSM_OK, NLSSM_E_ILL_FORMED or NLSSM_E_TRUNCATED_SEQUENCE
+};
+
+// ---- Text front ends ---------------------------------------------------------
+// Each answers: kMinSize (bytes of the shortest character), decode(p,
+// remaining), encode(character, out) (bytes written, at most 4), and the
+// class, bracket word and mirror image of a decoded character.
+
+class UnicodeProperties {
+ public:
+  explicit UnicodeProperties(const NLSSMHandle *handle) : classes_(handle) {}
+  uint8_t class_of(uint32_t c) { return classes_(c); }
+  static uint32_t bracket(uint32_t c) { return bracket_of(c); }
+  static uint32_t mirror(uint32_t c) { return mirror_of(c); }
+
+ private:
+  HostClasses classes_;
+};
+
+struct Utf8Text : UnicodeProperties {
+  static constexpr int64_t kMinSize = 1;
+  using UnicodeProperties::UnicodeProperties;
+
+  // Well-formed UTF-8 only; an ill-formed sequence is replaced as one
+  // character spanning its longest well-formed start (at least one byte).
+  static Decoded decode(const uint8_t *p, int64_t remaining) {
+    const uint8_t b = p[0];
+    if (b < 0x80) return {b, 1, NLSSM_OK};
+    int64_t size;
+    uint32_t c;
+    uint8_t low = 0x80, high = 0xBF;  // range of the second byte
+    if (b >= 0xC2 && b <= 0xDF) {
+      size = 2, c = b & 0x1Fu;
+    } else if (b >= 0xE0 && b <= 0xEF) {
+      size = 3, c = b & 0x0Fu;
+      if (b == 0xE0) low = 0xA0;
+      if (b == 0xED) high = 0x9F;
+    } else if (b >= 0xF0 && b <= 0xF4) {
+      size = 4, c = b & 0x07u;
+      if (b == 0xF0) low = 0x90;
+      if (b == 0xF4) high = 0x8F;
+    } else {
+      return {kReplacement, 1, NLSSM_E_ILL_FORMED};
+    }
+    for (int64_t k = 1; k < size; ++k) {
+      if (k >= remaining) return {kReplacement, k, NLSSM_E_TRUNCATED_SEQUENCE};
+      const uint8_t lo = k == 1 ? low : 0x80, hi = k == 1 ? high : 0xBF;
+      if (p[k] < lo || p[k] > hi) return {kReplacement, k, NLSSM_E_ILL_FORMED};
+      c = c << 6 | (p[k] & 0x3Fu);
+    }
+    return {c, size, NLSSM_OK};
+  }
+  static int64_t encode(uint32_t c, uint8_t *out) {
+    if (c < 0x80) {
+      out[0] = static_cast<uint8_t>(c);
+      return 1;
+    }
+    if (c < 0x800) {
+      out[0] = static_cast<uint8_t>(0xC0 | c >> 6);
+      out[1] = static_cast<uint8_t>(0x80 | (c & 0x3F));
+      return 2;
+    }
+    if (c < 0x10000) {
+      out[0] = static_cast<uint8_t>(0xE0 | c >> 12);
+      out[1] = static_cast<uint8_t>(0x80 | (c >> 6 & 0x3F));
+      out[2] = static_cast<uint8_t>(0x80 | (c & 0x3F));
+      return 3;
+    }
+    out[0] = static_cast<uint8_t>(0xF0 | c >> 18);
+    out[1] = static_cast<uint8_t>(0x80 | (c >> 12 & 0x3F));
+    out[2] = static_cast<uint8_t>(0x80 | (c >> 6 & 0x3F));
+    out[3] = static_cast<uint8_t>(0x80 | (c & 0x3F));
+    return 4;
+  }
+};
+
+// UTF-EBCDIC: each byte maps to an I8 byte, and I8 is UTF-8 with five-bit
+// trailing bytes (A0-BF) and single bytes up to 9F.
+struct UtfeText : UnicodeProperties {
+  static constexpr int64_t kMinSize = 1;
+  using UnicodeProperties::UnicodeProperties;
+
+  static uint8_t i8(uint8_t b) { return unicode::utfe_i8s[b]; }
+  static Decoded decode(const uint8_t *p, int64_t remaining) {
+    const uint8_t lead = i8(p[0]);
+    if (lead < 0xA0) return {lead, 1, NLSSM_OK};
+    const int64_t size = unicode::bytesFromI8S[lead] + 1;
+    if (size <= 0) return {kReplacement, 1, NLSSM_E_ILL_FORMED};
+    uint32_t c = lead & (0xFFu >> (size + 1));
+    for (int64_t k = 1; k < size; ++k) {
+      if (k >= remaining) return {kReplacement, k, NLSSM_E_TRUNCATED_SEQUENCE};
+      const uint8_t trail = i8(p[k]);
+      if (trail < 0xA0 || trail > 0xBF) return {kReplacement, k, NLSSM_E_ILL_FORMED};
+      c = c << 5 | (trail & 0x1Fu);
+    }
+    if (length_of(c) != size || c > 0x10FFFF || (c & 0xFFFFF800) == 0xD800)
+      return {kReplacement, size, NLSSM_E_ILL_FORMED};
+    return {c, size, NLSSM_OK};
+  }
+  static int64_t length_of(uint32_t c) {
+    return c < 0xA0 ? 1 : c < 0x400 ? 2 : c < 0x4000 ? 3 : c < 0x40000 ? 4 : 5;
+  }
+  static int64_t encode(uint32_t c, uint8_t *out) {
+    const int64_t size = length_of(c);
+    if (size == 1) {
+      out[0] = unicode::i8s_utfe[c];
+      return 1;
+    }
+    static constexpr uint8_t kLead[6] = {0, 0, 0xC0, 0xE0, 0xF0, 0xF8};
+    for (int64_t k = size - 1; k > 0; --k, c >>= 5) out[k] = unicode::i8s_utfe[0xA0 | (c & 0x1F)];
+    out[0] = unicode::i8s_utfe[kLead[size] | c];
+    return size;
+  }
+};
+
+template <bool kBig>
+struct Utf16Text : UnicodeProperties {
+  static constexpr int64_t kMinSize = 2;
+  using UnicodeProperties::UnicodeProperties;
+
+  static uint32_t unit(const uint8_t *p) {
+    return kBig ? uint32_t{p[0]} << 8 | p[1] : uint32_t{p[1]} << 8 | p[0];
+  }
+  static void put(uint32_t u, uint8_t *out) {
+    out[kBig ? 0 : 1] = static_cast<uint8_t>(u >> 8);
+    out[kBig ? 1 : 0] = static_cast<uint8_t>(u);
+  }
+  static Decoded decode(const uint8_t *p, int64_t remaining) {
+    if (remaining < 2) return {kReplacement, remaining, NLSSM_E_TRUNCATED_SEQUENCE};
+    const uint32_t u = unit(p);
+    if ((u & 0xF800) != 0xD800) return {u, 2, NLSSM_OK};
+    if ((u & 0xFC00) == 0xD800 && remaining >= 4 && (unit(p + 2) & 0xFC00) == 0xDC00)
+      return {0x10000 + ((u & 0x3FF) << 10 | (unit(p + 2) & 0x3FF)), 4, NLSSM_OK};
+    return {kReplacement, 2, NLSSM_E_ILL_FORMED};
+  }
+  static int64_t encode(uint32_t c, uint8_t *out) {
+    if (c < 0x10000) {
+      put(c, out);
+      return 2;
+    }
+    put(0xD800 | (c - 0x10000) >> 10, out);
+    put(0xDC00 | (c & 0x3FF), out + 2);
+    return 4;
+  }
+};
+
+template <bool kBig>
+struct Utf32Text : UnicodeProperties {
+  static constexpr int64_t kMinSize = 4;
+  using UnicodeProperties::UnicodeProperties;
+
+  static Decoded decode(const uint8_t *p, int64_t remaining) {
+    if (remaining < 4) return {kReplacement, remaining, NLSSM_E_TRUNCATED_SEQUENCE};
+    const uint32_t c =
+        kBig ? uint32_t{p[0]} << 24 | uint32_t{p[1]} << 16 | uint32_t{p[2]} << 8 | p[3]
+             : uint32_t{p[3]} << 24 | uint32_t{p[2]} << 16 | uint32_t{p[1]} << 8 | p[0];
+    if (c > 0x10FFFF || (c & 0xFFFFF800) == 0xD800) return {kReplacement, 4, NLSSM_E_ILL_FORMED};
+    return {c, 4, NLSSM_OK};
+  }
+  static int64_t encode(uint32_t c, uint8_t *out) {
+    for (int k = 0; k < 4; ++k) out[kBig ? 3 - k : k] = static_cast<uint8_t>(c >> (8 * k));
+    return 4;
+  }
+};
+
+// Single-byte right-to-left code pages: the reordering categories of the
+// page's bidirectional table, its ( ) [ ] { } as paired brackets and its
+// eight bracket-like characters as mirror images. A page without a table
+// has no right-to-left characters: every byte is taken as L.
+struct SbcsText {
+  static constexpr int64_t kMinSize = 1;
+  const catalogue::BidiTable *table;
+
+  explicit SbcsText(const NLSSMHandle *handle)
+      : table(reinterpret_cast<const catalogue::BidiTable *>(handle->bidiTable)) {}
+  static Decoded decode(const uint8_t *p, int64_t) { return {p[0], 1, NLSSM_OK}; }
+  static int64_t encode(uint32_t c, uint8_t *out) {
+    out[0] = static_cast<uint8_t>(c);
+    return 1;
+  }
+  uint8_t class_of(uint32_t byte) const {
+    if (table == nullptr) return L;
+    switch (table->reorder[byte]) {
+      case catalogue::kBidiL:
+        return L;
+      case catalogue::kBidiR:
+        return R;
+      case catalogue::kBidiAL:
+        return AL;
+      case catalogue::kBidiEN:
+        return EN;
+      case catalogue::kBidiET:
+      case catalogue::kBidiAsciiET:
+        return ET;
+      case catalogue::kBidiCS:
+      case catalogue::kBidiAsciiCS:
+        return CS;
+      case catalogue::kBidiWS:
+        return WS;
+      default:
+        return ON;
+    }
+  }
+  uint32_t bracket(uint32_t byte) const {
+    if (table == nullptr || byte == 0) return 0;
+    for (int k = 0; k < 6; ++k)
+      if (table->brackets[k] == byte)
+        return bracket_word(table->brackets[k & ~1], k & 1 ? kClosingBracket : kOpeningBracket);
+    return 0;
+  }
+  uint32_t mirror(uint32_t byte) const {
+    if (table == nullptr || byte == 0) return 0;
+    for (int k = 0; k < 8; ++k)
+      if (table->brackets[k] == byte) return table->mirrors[k];
+    return 0;
+  }
+};
+
+// ---- The operation -------------------------------------------------------------
+
+template <typename Text>
+int64_t reorder(const NLSSMHandle *handle, const uint8_t *source, int64_t sourceBytes,
+                uint8_t *destination, int64_t capacity, int64_t *written, uint8_t *direction) {
+  if (written != nullptr) *written = 0;
+  if (handle == nullptr || direction == nullptr) return NLSSM_E_NULL_ARGUMENT;
+  if (sourceBytes < 0) sourceBytes = 0;
+  if (capacity < 0) capacity = 0;
+  if ((source == nullptr && sourceBytes > 0) || (destination == nullptr && capacity > 0))
+    return NLSSM_E_NULL_ARGUMENT;
+  const int requested = *direction;
+  *direction = requested == 1 ? 1 : 0;
+  if (sourceBytes == 0) return NLSSM_OK;
+  if (sourceBytes / Text::kMinSize >= 0x7FFFFFFF) return NLSSM_E_NO_MEMORY;
+
+  // Work area: order, offsets (one more), substitutes and bracket words (4
+  // bytes each), the resolution's work, then classes and levels.
+  const uint64_t most = static_cast<uint64_t>((sourceBytes + Text::kMinSize - 1) / Text::kMinSize);
+  const uint64_t words = 4 * most + 2;
+  const uint64_t bytes = 4 * words + work_bytes(most) + 2 * most + 8;
+  module::WorkBuffer<2048> buffer;
+  if (!buffer.reserve(handle, bytes)) return NLSSM_E_NO_MEMORY;
+  auto *order = reinterpret_cast<uint32_t *>(buffer.data());
+  uint32_t *offsets = order + most;
+  uint32_t *substitutes = offsets + most + 1;
+  uint32_t *brackets = substitutes + most;
+  void *work = brackets + most + (most & 1);
+  uint8_t *classes = static_cast<uint8_t *>(work) + work_bytes(most);
+  uint8_t *levels = classes + most;
+
+  Text text(handle);
+  int64_t status = NLSSM_OK;
+  uint32_t n = 0;
+  for (int64_t at = 0; at < sourceBytes; ++n) {
+    const Decoded d = Text::decode(source + at, sourceBytes - at);
+    offsets[n] = static_cast<uint32_t>(at);
+    if (d.status != NLSSM_OK) {
+      if (status == NLSSM_OK) status = d.status;
+      classes[n] = ON;
+      brackets[n] = 0;
+      substitutes[n] = kAlways | d.character;
+    } else {
+      classes[n] = text.class_of(d.character);
+      brackets[n] = text.bracket(d.character);
+      substitutes[n] = text.mirror(d.character);
+    }
+    at += d.size;
+  }
+  offsets[n] = static_cast<uint32_t>(sourceBytes);
+
+  const Line line{classes, brackets, n};
+  *direction = static_cast<uint8_t>(resolve(line, requested, levels, order, work));
+
+  int64_t out = 0;
+  for (uint32_t v = 0; v < n; ++v) {
+    const uint32_t i = order[v];
+    const uint32_t substitute = substitutes[i];
+    uint8_t encoded[4];
+    const uint8_t *bytesOf = source + offsets[i];
+    int64_t size = offsets[i + 1] - offsets[i];
+    if ((substitute & kAlways) || (substitute != 0 && (levels[i] & 1))) {
+      size = Text::encode(substitute & ~kAlways, encoded);
+      bytesOf = encoded;
+    }
+    if (size > capacity - out) {
+      status = NLSSM_E_DEST_TOO_SMALL;
+      break;
+    }
+    std::memcpy(destination + out, bytesOf, static_cast<std::size_t>(size));
+    out += size;
+  }
+  if (written != nullptr) *written = out;
+  return status;
+}
+
+// Both directions run the same transformation: a displayed line is resolved
+// as if it were in reading order and its runs are reversed back, which
+// restores the reading order of every run that resolves alike in both
+// orders.
+using Reorder = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, uint8_t *, int64_t,
+                            int64_t *, uint8_t *);
+
+// The member for a handle: UTF-8 (encoding 20) or UTF-EBCDIC in class 1,
+// big-endian units for encodings 24 and 26.
+Reorder utf_member(const NLSSMHandle *handle) {
+  return handle != nullptr && handle->encodingNumber != NLSSM_ENC_UTF8 ? &reorder<UtfeText>
+                                                                       : &reorder<Utf8Text>;
+}
+Reorder wcs2_member(const NLSSMHandle *handle) {
+  return handle != nullptr && handle->encodingNumber == NLSSM_ENC_WCS2_BE
+             ? &reorder<Utf16Text<true>>
+             : &reorder<Utf16Text<false>>;
+}
+Reorder wcs4_member(const NLSSMHandle *handle) {
+  return handle != nullptr && handle->encodingNumber == NLSSM_ENC_WCS4_BE
+             ? &reorder<Utf32Text<true>>
+             : &reorder<Utf32Text<false>>;
+}
+
+}  // namespace
+}  // namespace nlssm::bidi
+
+extern "C" {
+
+int64_t NLSVisualOrderFormat_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                  int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                  int64_t *written, uint8_t *direction) {
+  return nlssm::bidi::reorder<nlssm::bidi::SbcsText>(handle, source, sourceBytes, destination,
+                                                     capacity, written, direction);
+}
+int64_t NLSLogicalOrderFormat_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                   int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                   int64_t *written, uint8_t *direction) {
+  return nlssm::bidi::reorder<nlssm::bidi::SbcsText>(handle, source, sourceBytes, destination,
+                                                     capacity, written, direction);
+}
+int64_t NLSVisualOrderFormat_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                  int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                  int64_t *written, uint8_t *direction) {
+  return nlssm::bidi::utf_member(handle)(handle, source, sourceBytes, destination, capacity,
+                                         written, direction);
+}
+int64_t NLSLogicalOrderFormat_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                   int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                   int64_t *written, uint8_t *direction) {
+  return nlssm::bidi::utf_member(handle)(handle, source, sourceBytes, destination, capacity,
+                                         written, direction);
+}
+int64_t NLSVisualOrderFormat_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                  int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                  int64_t *written, uint8_t *direction) {
+  return nlssm::bidi::wcs2_member(handle)(handle, source, sourceBytes, destination, capacity,
+                                          written, direction);
+}
+int64_t NLSLogicalOrderFormat_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                   int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                   int64_t *written, uint8_t *direction) {
+  return nlssm::bidi::wcs2_member(handle)(handle, source, sourceBytes, destination, capacity,
+                                          written, direction);
+}
+int64_t NLSVisualOrderFormat_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                  int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                  int64_t *written, uint8_t *direction) {
+  return nlssm::bidi::wcs4_member(handle)(handle, source, sourceBytes, destination, capacity,
+                                          written, direction);
+}
+int64_t NLSLogicalOrderFormat_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                   int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                   int64_t *written, uint8_t *direction) {
+  return nlssm::bidi::wcs4_member(handle)(handle, source, sourceBytes, destination, capacity,
+                                          written, direction);
+}
+
+}  // extern "C"
