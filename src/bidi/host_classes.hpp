@@ -1,5 +1,6 @@
 // Bidirectional categories of code points, asked of the host NLS object (the
-// handle's owner) through its character-information query.
+// handle's owner) through its character-information query, and the
+// properties the reordering reads with them.
 #pragma once
 
 #include <nlssm/host.h>
@@ -7,6 +8,7 @@
 
 #include <cstdint>
 
+#include "bidi/pairs.hpp"
 #include "module/host_access.hpp"
 
 namespace nlssm::bidi {
@@ -19,33 +21,45 @@ inline int64_t host_category(const NLSSMHandle *handle, uint32_t value) {
   return info.bidiCategory;
 }
 
-// Categories for one pass over a text: a small direct-mapped cache in front
-// of the host query, since running text repeats its characters. A character
-// the host does not know, or a category outside the algorithm's classes,
-// counts as ON (other neutral).
-class HostClasses {
+// What the reordering needs of a character: its class (the host's category;
+// a character the host does not know, or a category outside the
+// algorithm's classes, counts as ON), its bracket word and mirror image
+// (pairs.hpp). A small direct-mapped cache sits in front, since running
+// text repeats its characters.
+struct CharProperties {
+  uint8_t bidiClass;
+  uint32_t bracket;
+  uint32_t mirror;
+};
+
+class HostProperties {
  public:
-  explicit HostClasses(const NLSSMHandle *handle) : handle_(handle) {
-    for (uint32_t &tag : tags_) tag = kEmpty;
+  explicit HostProperties(const NLSSMHandle *handle) : handle_(handle) {
+    for (Entry &e : entries_) e.character = kEmpty;
   }
-  uint8_t operator()(uint32_t character) {
-    const uint32_t slot = character & (kSize - 1);
-    if (tags_[slot] != character) {
+  const CharProperties &operator()(uint32_t character) {
+    Entry &e = entries_[character & (kSize - 1)];
+    if (e.character != character) {
       const int64_t category = host_category(handle_, character);
-      tags_[slot] = character;
-      classes_[slot] = category >= 0 && category <= NLSHOST_BIDI_PDI
-                           ? static_cast<uint8_t>(category)
-                           : static_cast<uint8_t>(NLSHOST_BIDI_ON);
+      e.character = character;
+      e.properties.bidiClass = category >= 0 && category <= NLSHOST_BIDI_PDI
+                                   ? static_cast<uint8_t>(category)
+                                   : static_cast<uint8_t>(NLSHOST_BIDI_ON);
+      e.properties.bracket = bracket_of(character);
+      e.properties.mirror = mirror_of(character);
     }
-    return classes_[slot];
+    return e.properties;
   }
 
  private:
-  static constexpr uint32_t kSize = 256;
+  struct Entry {
+    uint32_t character;
+    CharProperties properties;
+  };
+  static constexpr uint32_t kSize = 512;
   static constexpr uint32_t kEmpty = 0xFFFFFFFFu;
   const NLSSMHandle *handle_;
-  uint32_t tags_[kSize];
-  uint8_t classes_[kSize];
+  Entry entries_[kSize];
 };
 
 }  // namespace nlssm::bidi

@@ -31,18 +31,16 @@ struct Decoded {
 
 // ---- Text front ends ---------------------------------------------------------
 // Each answers: kMinSize (bytes of the shortest character), decode(p,
-// remaining), encode(character, out) (bytes written, at most 4), and the
-// class, bracket word and mirror image of a decoded character.
+// remaining), encode(character, out) (bytes written, at most 5), and the
+// properties (class, bracket word, mirror image) of a decoded character.
 
 class UnicodeProperties {
  public:
-  explicit UnicodeProperties(const NLSSMHandle *handle) : classes_(handle) {}
-  uint8_t class_of(uint32_t c) { return classes_(c); }
-  static uint32_t bracket(uint32_t c) { return bracket_of(c); }
-  static uint32_t mirror(uint32_t c) { return mirror_of(c); }
+  explicit UnicodeProperties(const NLSSMHandle *handle) : properties_(handle) {}
+  const CharProperties &properties(uint32_t c) { return properties_(c); }
 
  private:
-  HostClasses classes_;
+  HostProperties properties_;
 };
 
 struct Utf8Text : UnicodeProperties {
@@ -200,12 +198,19 @@ struct SbcsText {
   const catalogue::BidiTable *table;
 
   explicit SbcsText(const NLSSMHandle *handle)
-      : table(reinterpret_cast<const catalogue::BidiTable *>(handle->bidiTable)) {}
+      : table(reinterpret_cast<const catalogue::BidiTable *>(handle->bidiTable)) {
+    for (uint32_t b = 0; b < 256; ++b) byByte[b] = {class_of(b), bracket(b), mirror(b)};
+  }
   static Decoded decode(const uint8_t *p, int64_t) { return {p[0], 1, NLSSM_OK}; }
   static int64_t encode(uint32_t c, uint8_t *out) {
     out[0] = static_cast<uint8_t>(c);
     return 1;
   }
+  const CharProperties &properties(uint32_t byte) const { return byByte[byte]; }
+
+  CharProperties byByte[256];
+
+ private:
   uint8_t class_of(uint32_t byte) const {
     if (table == nullptr) return L;
     switch (table->reorder[byte]) {
@@ -287,9 +292,10 @@ int64_t reorder(const NLSSMHandle *handle, const uint8_t *source, int64_t source
       brackets[n] = 0;
       substitutes[n] = kAlways | d.character;
     } else {
-      classes[n] = text.class_of(d.character);
-      brackets[n] = text.bracket(d.character);
-      substitutes[n] = text.mirror(d.character);
+      const CharProperties &p = text.properties(d.character);
+      classes[n] = p.bidiClass;
+      brackets[n] = p.bracket;
+      substitutes[n] = p.mirror;
     }
     at += d.size;
   }
@@ -302,7 +308,7 @@ int64_t reorder(const NLSSMHandle *handle, const uint8_t *source, int64_t source
   for (uint32_t v = 0; v < n; ++v) {
     const uint32_t i = order[v];
     const uint32_t substitute = substitutes[i];
-    uint8_t encoded[4];
+    uint8_t encoded[8];
     const uint8_t *bytesOf = source + offsets[i];
     int64_t size = offsets[i + 1] - offsets[i];
     if ((substitute & kAlways) || (substitute != 0 && (levels[i] & 1))) {
