@@ -276,7 +276,7 @@ int64_t reorder(const NLSSMHandle *handle, const uint8_t *source, int64_t source
   uint32_t *offsets = order + most;
   uint32_t *substitutes = offsets + most + 1;
   uint32_t *brackets = substitutes + most;
-  void *work = brackets + most + (most & 1);
+  void *work = order + words;  // an even word count: 8-byte aligned
   uint8_t *classes = static_cast<uint8_t *>(work) + work_bytes(most);
   uint8_t *levels = classes + most;
 

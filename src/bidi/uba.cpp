@@ -160,22 +160,21 @@ void explicit_levels(const uint8_t *classes, uint32_t begin, uint32_t end, int p
   }
 }
 
-// W1-W7 over one isolating run sequence.
+// W1-W7 over one isolating run sequence, the rules that need nothing but
+// the types before them merged into single passes.
 void resolve_weak(const uint32_t *s, uint32_t len, uint8_t sos, uint8_t *t) {
-  uint8_t previous = sos;
-  for (uint32_t k = 0; k < len; ++k) {  // W1
-    uint8_t &type = t[s[k]];
+  // W1-W3: `previous` is the type W1 gave the character before, `strong`
+  // the last L, R or AL after W1.
+  uint8_t previous = sos, strong = sos;
+  for (uint32_t k = 0; k < len; ++k) {
+    uint8_t type = t[s[k]];
     if (type == NSM) type = isolate_initiator(previous) || previous == PDI ? uint8_t{ON} : previous;
     previous = type;
-  }
-  uint8_t strong = sos;
-  for (uint32_t k = 0; k < len; ++k) {  // W2, W3
-    uint8_t &type = t[s[k]];
     if (type == L || type == R || type == AL) strong = type;
     if (type == EN && strong == AL) type = AN;
+    if (type == AL) type = R;
+    t[s[k]] = type;
   }
-  for (uint32_t k = 0; k < len; ++k)
-    if (t[s[k]] == AL) t[s[k]] = R;
   for (uint32_t k = 1; k + 1 < len; ++k) {  // W4
     uint8_t &type = t[s[k]];
     const uint8_t before = t[s[k - 1]], after = t[s[k + 1]];
@@ -193,13 +192,10 @@ void resolve_weak(const uint32_t *s, uint32_t len, uint8_t sos, uint8_t *t) {
       for (uint32_t m = k; m < j; ++m) t[s[m]] = EN;
     k = j;
   }
-  for (uint32_t k = 0; k < len; ++k) {  // W6
+  strong = sos;
+  for (uint32_t k = 0; k < len; ++k) {  // W6, W7
     uint8_t &type = t[s[k]];
     if (type == ES || type == ET || type == CS) type = ON;
-  }
-  strong = sos;
-  for (uint32_t k = 0; k < len; ++k) {  // W7
-    uint8_t &type = t[s[k]];
     if (type == L || type == R) strong = type;
     if (type == EN && strong == L) type = L;
   }
@@ -404,7 +400,8 @@ void reverse_levels(const uint8_t *levels, uint32_t begin, uint32_t end, uint32_
 int resolve(const Line &line, int direction, uint8_t *levels, uint32_t *order, void *work) {
   const uint32_t n = line.n;
   auto *words = static_cast<uint32_t *>(work);
-  Work w{words, words + n, words + 2 * n, words + 5 * n + 2,
+  // The pairs are sorted as 64-bit words: they start at an even word.
+  Work w{words, words + n, words + 2 * n, words + 5 * n + (n & 1) + 2,
          reinterpret_cast<uint8_t *>(words + 7 * n + 4)};
   int firstLevel = -1;
   for (uint32_t begin = 0; begin < n;) {

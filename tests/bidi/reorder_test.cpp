@@ -4,6 +4,7 @@
 // the round trip of visual and logical order.
 #include <gtest/gtest.h>
 #include <unicode/ubidi.h>
+#include <unicode/ucnv.h>
 #include <unicode/ustring.h>
 #include <unicode/utf16.h>
 #include <unicode/utf8.h>
@@ -47,8 +48,7 @@ Text random_text(std::mt19937 &rng) {
   return text;
 }
 
-// ICU's display order (with mirroring) and paragraph level.
-std::pair<Text, int> icu_visual(const Text &text, int direction) {
+std::u16string to_u16(const Text &text) {
   std::u16string u16;
   for (UChar32 c : text) {
     UChar units[2];
@@ -56,6 +56,12 @@ std::pair<Text, int> icu_visual(const Text &text, int direction) {
     U16_APPEND_UNSAFE(units, n, c);
     u16.append(units, units + n);
   }
+  return u16;
+}
+
+// ICU's display order (with mirroring) and paragraph level.
+std::pair<Text, int> icu_visual(const Text &text, int direction) {
+  const std::u16string u16 = to_u16(text);
   UErrorCode error = U_ZERO_ERROR;
   UBiDi *bidi = ubidi_open();
   const UBiDiLevel level = direction == 2 ? UBIDI_DEFAULT_LTR : static_cast<UBiDiLevel>(direction);
@@ -75,72 +81,53 @@ std::pair<Text, int> icu_visual(const Text &text, int direction) {
   return {visual, paragraph};
 }
 
-// Text in and out of each UTF encoding, the UTF-EBCDIC one through the
-// module's own handle-bound converters.
+// Text in and out of each UTF encoding: ICU's converters, and for
+// UTF-EBCDIC the module's own handle-bound ones.
+const char *icu_name(int encoding) {
+  return encoding == 20   ? "UTF-8"
+         : encoding == 24 ? "UTF-16BE"
+         : encoding == 25 ? "UTF-16LE"
+         : encoding == 26 ? "UTF-32BE"
+                          : "UTF-32LE";
+}
 Bytes encode(int encoding, const Text &text) {
-  Bytes out;
-  for (UChar32 c : text) {
-    uint8_t bytes[8];
-    int32_t n = 0;
-    switch (encoding) {
-      case 20:
-        U8_APPEND_UNSAFE(bytes, n, c);
-        break;
-      case 161:
-        n = static_cast<int32_t>(ToUTFE(handle(161), static_cast<uint32_t>(c), bytes));
-        break;
-      case 24:
-      case 25: {
-        UChar units[2];
-        int32_t k = 0;
-        U16_APPEND_UNSAFE(units, k, c);
-        for (int32_t u = 0; u < k; ++u) {
-          bytes[n++] = static_cast<uint8_t>(encoding == 24 ? units[u] >> 8 : units[u]);
-          bytes[n++] = static_cast<uint8_t>(encoding == 24 ? units[u] : units[u] >> 8);
-        }
-        break;
-      }
-      default:  // 26 big-endian, 27 little-endian UTF-32
-        for (int k = 0; k < 4; ++k)
-          bytes[n++] = static_cast<uint8_t>(c >> (encoding == 26 ? 24 - 8 * k : 8 * k));
-    }
-    out.insert(out.end(), bytes, bytes + n);
+  Bytes out(text.size() * 5 + 8);
+  int32_t n = 0;
+  if (encoding == 161) {
+    for (UChar32 c : text) n += int32_t(ToUTFE(handle(161), uint32_t(c), out.data() + n));
+  } else {
+    const std::u16string u16 = to_u16(text);
+    UErrorCode error = U_ZERO_ERROR;
+    n = ucnv_convert(icu_name(encoding), "UTF-16LE", reinterpret_cast<char *>(out.data()),
+                     int32_t(out.size()), reinterpret_cast<const char *>(u16.data()),
+                     int32_t(u16.size() * 2), &error);
   }
+  out.resize(size_t(n));
   return out;
 }
 Text decode(int encoding, Bytes bytes) {
   Text out;
-  bytes.resize(bytes.size() + 8);  // the converters read ahead of short texts
-  const int32_t n = static_cast<int32_t>(bytes.size() - 8);
-  for (int32_t i = 0; i < n;) {
-    UChar32 c = 0;
-    switch (encoding) {
-      case 20:
-        U8_NEXT(bytes.data(), i, n, c);
-        break;
-      case 161: {
-        uint32_t cp = 0;
-        const int64_t k = FromUTFE(handle(161), bytes.data() + i, &cp);
-        c = k > 0 ? static_cast<UChar32>(cp) : -1;
-        i += k > 0 ? static_cast<int32_t>(k) : 1;
-        break;
-      }
-      case 24:
-      case 25: {
-        auto unit = [&](int32_t at) -> UChar {
-          return encoding == 24 ? UChar(bytes[at] << 8 | bytes[at + 1])
-                                : UChar(bytes[at + 1] << 8 | bytes[at]);
-        };
-        c = unit(i);
-        i += 2;
-        if (U16_IS_LEAD(c) && i < n) c = U16_GET_SUPPLEMENTARY(c, unit(i)), i += 2;
-        break;
-      }
-      default:
-        for (int k = 0; k < 4; ++k)
-          c |= UChar32(bytes[i + k]) << (encoding == 26 ? 24 - 8 * k : 8 * k);
-        i += 4;
+  const size_t n = bytes.size();
+  bytes.resize(n + 8);  // the UTF-EBCDIC converter reads ahead of a short text
+  if (encoding == 161) {
+    for (size_t i = 0; i < n;) {
+      uint32_t c = 0;
+      const int64_t k = FromUTFE(handle(161), bytes.data() + i, &c);
+      out.push_back(k > 0 ? UChar32(c) : -1);
+      i += k > 0 ? size_t(k) : 1;
     }
+    return out;
+  }
+  std::u16string u16(n + 8, u'\0');
+  UErrorCode error = U_ZERO_ERROR;
+  const int32_t units =
+      ucnv_convert("UTF-16LE", icu_name(encoding), reinterpret_cast<char *>(u16.data()),
+                   int32_t(u16.size() * 2), reinterpret_cast<const char *>(bytes.data()),
+                   int32_t(n), &error) /
+      2;
+  for (int32_t i = 0; i < units;) {
+    UChar32 c;
+    U16_NEXT(u16.data(), i, units, c);
     out.push_back(c);
   }
   return out;
@@ -164,7 +151,8 @@ TEST_P(UtfReorder, RandomMixedTextsMatchIcu) {
       ++failures;
       std::string codes;
       for (UChar32 c : text) codes += std::to_string(c) + " ";
-      ADD_FAILURE() << "direction " << direction << ": " << codes;
+      ADD_FAILURE() << "direction " << direction << " status " << got.status << " paragraph "
+                    << got.direction << " of " << paragraph << ": " << codes;
     }
   }
 }
