@@ -22,15 +22,21 @@ Decision decide(int64_t category) {
   return Decision::kGoOn;
 }
 
-// Feeds the categories of a text's characters, in order, to the decision
-// rule. `next(offset, category)` answers the offset after the character
-// at `offset` and its category, or a status (negative offset) for
-// malformed text.
-template <typename Next>
-int64_t scan(const uint8_t *text, int64_t length, uint8_t *direction, Next next) {
+// The answer before any character is read, and for text that is not
+// scanned: left-to-right.
+int64_t left_to_right(uint8_t *direction) {
   if (direction == nullptr) return NLSSM_E_NULL_ARGUMENT;
   *direction = 0;
-  if (length <= 0) return NLSSM_OK;
+  return NLSSM_OK;
+}
+
+// Feeds the categories of a text's characters, in order, to the decision
+// rule. `next(offset, category)` answers the offset after the character
+// at `offset` and its category, or a negative offset for malformed text.
+template <typename Next>
+int64_t scan(const uint8_t *text, int64_t length, uint8_t *direction, Next next) {
+  if (const int64_t status = left_to_right(direction); status != NLSSM_OK || length <= 0)
+    return status;
   if (text == nullptr) return NLSSM_E_NULL_ARGUMENT;
   for (int64_t offset = 0; offset < length;) {
     int64_t category = -1;
@@ -106,11 +112,10 @@ int64_t NLSGetBaseDirection_UTF8(const NLSSMHandle *handle, const uint8_t *text,
   });
 }
 
+// UTF-EBCDIC text is not scanned.
 int64_t NLSGetBaseDirection_UTFE(const NLSSMHandle *, const uint8_t *, int64_t,
                                  uint8_t *direction) {
-  if (direction == nullptr) return NLSSM_E_NULL_ARGUMENT;
-  *direction = 0;
-  return NLSSM_OK;
+  return nlssm::bidi::left_to_right(direction);
 }
 
 // A surrogate pair goes to the host as (high << 16) | low.
@@ -143,11 +148,10 @@ int64_t NLSGetBaseDirection_WCS4(const NLSSMHandle *handle, const uint8_t *text,
   });
 }
 
+// Multi-byte text is not scanned.
 int64_t NLSGetBaseDirection_MBCS(const NLSSMHandle *, const uint8_t *, int64_t,
                                  uint8_t *direction) {
-  if (direction == nullptr) return NLSSM_E_NULL_ARGUMENT;
-  *direction = 0;
-  return NLSSM_OK;
+  return nlssm::bidi::left_to_right(direction);
 }
 
 }  // extern "C"
