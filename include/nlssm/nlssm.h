@@ -1030,24 +1030,30 @@ NLSSM_API int64_t NLSGetBaseDirection_MBCS(const NLSSMHandle *handle, const uint
  *   NLSVisualOrderFormat: text in reading (logical) order -> display order,
  *     left to right; characters at right-to-left levels that have a mirror
  *     image are shown mirrored.
- *   NLSLogicalOrderFormat: a displayed line -> reading order. The line is
- *     resolved as if it were in reading order and its runs are reversed (and
- *     mirrored) back: this undoes NLSVisualOrderFormat for lines whose runs
- *     resolve alike in both orders (words of either direction with blanks
- *     between them, numbers inside right-to-left text), and is an
- *     approximation otherwise, as every visual-to-logical reordering is.
+ *   NLSLogicalOrderFormat: a displayed line -> a reading order that
+ *     displays as that line (with the same paragraph level). The first
+ *     attempt is the line resolved as if it were in reading order with its
+ *     runs reversed (and mirrored) back; while an attempt does not display as
+ *     the line, up to 8 more each undo the display order the previous one
+ *     resolved to. When none does, the first attempt is the result (status
+ *     0 all the same): a line may have no reading order that displays as it.
+ *     Words of either direction with blanks between them come back exactly
+ *     as they were written; in general a line can come from several reading
+ *     orders, and this gives one of them.
  * (handle, source, source bytes, destination, capacity in bytes, out bytes
  * written (may be null), direction) -> status.
  * *direction in: 0 left-to-right, 1 right-to-left, any other value: from the
  * text's first strong character outside isolates (left-to-right when it has
- * none). Out: the paragraph level used, 0 or 1 (of the first paragraph).
+ * none; for NLSLogicalOrderFormat the displayed line's first, from the
+ * left). Out: the paragraph level used, 0 or 1 (of the first paragraph).
  * A paragraph separator ends a paragraph: each is resolved and reordered on
  * its own, in place. Embedding and override controls and boundary neutrals
  * stay in the text, placed with the character before them.
  * Characters: SBCS bytes with the categories of the reordering table of the
- * handle's bidiTable (a byte without a category counts as ON, the page's ( ) [ ] { } are
- * paired brackets, its eight bracket-like characters mirror); without a
- * table every byte is left-to-right and the text comes back unchanged. UTF-8
+ * handle's bidiTable (a byte without a category counts as ON; the page's
+ * ( ) [ ] { } are paired brackets, its eight bracket-like characters
+ * mirror); without a table every byte is left-to-right and the text comes
+ * back unchanged. UTF-8
  * (encoding 20) or UTF-EBCDIC (other class-1 encodings), UTF-16 (WCS2;
  * big-endian for encoding 24, else little-endian) and UTF-32 (WCS4;
  * big-endian for encoding 26, else little-endian) with the host's categories
@@ -1057,10 +1063,10 @@ NLSSM_API int64_t NLSGetBaseDirection_MBCS(const NLSSMHandle *handle, const uint
  * NLSSM_E_TRUNCATED_SEQUENCE; the rest is still reordered.
  * The output takes as many bytes as the input, save for replaced input and
  * mirror images of another length. When it does not fit, the characters that
- * fit (in display order, none split) are written and the result is
+ * fit (in output order, none split) are written and the result is
  * NLSSM_E_DEST_TOO_SMALL; nothing is written past `capacity`. Negative
  * lengths count as 0. Null handle or direction, or a null buffer with a
- * positive length: NLSSM_E_NULL_ARGUMENT. The work area (about 50 bytes per
+ * positive length: NLSSM_E_NULL_ARGUMENT. The work area (about 70 bytes per
  * character) comes from the handle's pool beyond 2 KiB: NLSSM_E_NO_MEMORY
  * when the pool refuses. The source and destination must not overlap. */
 NLSSM_API int64_t NLSVisualOrderFormat_SBCS(const NLSSMHandle *handle, const uint8_t *source,

@@ -251,7 +251,174 @@ struct SbcsText {
 
 // ---- The operation -------------------------------------------------------------
 
+// Refinements a logical-order request tries before it settles for its
+// first attempt.
+constexpr int kAttempts = 8;
+
+// A line's characters in some order: position i shows source character
+// from[i], as its mirror image when mirrored[i].
+struct Arrangement {
+  uint32_t *from;
+  uint8_t *mirrored;
+};
+
 template <typename Text>
+class Reorderer {
+ public:
+  Reorderer(const NLSSMHandle *handle, const uint8_t *source) : text_(handle), source_(source) {}
+
+  // Room for a line of up to `most` characters; false when the pool refuses.
+  bool reserve(const NLSSMHandle *handle, uint64_t most) {
+    // 4-byte words first (an even count keeps the resolution's work 8-byte
+    // aligned), then the work, then the bytes.
+    const uint64_t words = 8 * most + 2;
+    if (!buffer_.reserve(handle, 4 * words + work_bytes(most) + 6 * most + 8)) return false;
+    auto *w = reinterpret_cast<uint32_t *>(buffer_.data());
+    offsets_ = w, chars_ = w + most + 1, order_ = w + 2 * most + 1, brackets_ = w + 3 * most + 1;
+    work_ = w + words;
+    uint8_t *b = static_cast<uint8_t *>(work_) + work_bytes(most);
+    classes_ = b, levels_ = b + most;
+    for (int k = 0; k < 3; ++k) sets_[k] = {w + (4 + k) * most + 1, b + (2 + k) * most};
+    return true;
+  }
+
+  // Decodes the source: the first status of ill-formed input, else 0.
+  int64_t decode(int64_t sourceBytes) {
+    int64_t status = NLSSM_OK;
+    n_ = 0;
+    for (int64_t at = 0; at < sourceBytes; ++n_) {
+      const Decoded d = Text::decode(source_ + at, sourceBytes - at);
+      offsets_[n_] = static_cast<uint32_t>(at);
+      chars_[n_] = d.character;
+      if (d.status != NLSSM_OK) {
+        if (status == NLSSM_OK) status = d.status;
+        chars_[n_] |= kIllFormed;
+      }
+      at += d.size;
+    }
+    offsets_[n_] = static_cast<uint32_t>(sourceBytes);
+    return status;
+  }
+
+  // Reading order to display order: the source as it stands, resolved.
+  int visual(int direction, Arrangement &shown) {
+    Arrangement &source = identity();
+    const int paragraph = resolve_arrangement(source, direction);
+    display(source, shown);
+    return paragraph;
+  }
+
+  // Display order to reading order: an arrangement of the line that
+  // displays as the line. The first attempt is the line resolved as if it
+  // were in reading order and its runs reversed back; each next one undoes
+  // the display order the previous attempt resolved to. When none of them
+  // displays as the line, the first attempt stands.
+  int logical(int direction, Arrangement *&result) {
+    Arrangement &first = sets_[1];
+    const int paragraph = visual(direction, first);
+    Arrangement *attempt = &first, *next = &sets_[0];
+    result = &first;
+    for (int k = 0; k < kAttempts; ++k) {
+      resolve_arrangement(*attempt, paragraph);
+      bool displaysAsLine = true;
+      for (uint32_t v = 0; v < n_ && displaysAsLine; ++v)
+        displaysAsLine = shown_at(*attempt, order_[v]) == point(v);
+      if (displaysAsLine) {
+        result = attempt;
+        break;
+      }
+      bool moved = false;
+      for (uint32_t v = 0; v < n_; ++v) {
+        const uint32_t i = order_[v];
+        const uint8_t mirrored = (levels_[i] & 1) && mirror(point(v)) != 0;
+        moved = moved || attempt->from[i] != v || attempt->mirrored[i] != mirrored;
+        next->from[i] = v;
+        next->mirrored[i] = mirrored;
+      }
+      if (!moved) break;
+      attempt = next;
+      next = attempt == &sets_[0] ? &sets_[2] : &sets_[0];
+    }
+    return paragraph;
+  }
+
+  Arrangement &scratch() { return sets_[2]; }
+
+  // Writes an arrangement: what fits, no character split. NLSSM_OK or
+  // NLSSM_E_DEST_TOO_SMALL, with `out` the bytes written.
+  int64_t write(const Arrangement &a, uint8_t *destination, int64_t capacity, int64_t &out) {
+    out = 0;
+    for (uint32_t i = 0; i < n_; ++i) {
+      const uint32_t j = a.from[i];
+      const uint32_t c = a.mirrored[i] ? mirror(point(j)) : point(j);
+      uint8_t encoded[8];
+      const uint8_t *bytes = source_ + offsets_[j];
+      int64_t size = offsets_[j + 1] - offsets_[j];
+      if (c != chars_[j]) {  // a mirror image, or the stand-in for ill-formed input
+        size = Text::encode(c, encoded);
+        bytes = encoded;
+      }
+      if (size > capacity - out) return NLSSM_E_DEST_TOO_SMALL;
+      std::memcpy(destination + out, bytes, static_cast<std::size_t>(size));
+      out += size;
+    }
+    return NLSSM_OK;
+  }
+
+ private:
+  static constexpr uint32_t kIllFormed = 0x80000000u;
+
+  uint32_t point(uint32_t j) const { return chars_[j] & ~kIllFormed; }
+  uint32_t mirror(uint32_t c) { return text_.properties(c).mirror; }
+  uint32_t character(const Arrangement &a, uint32_t i) {
+    return a.mirrored[i] ? mirror(point(a.from[i])) : point(a.from[i]);
+  }
+  // What position i of a resolved arrangement shows.
+  uint32_t shown_at(const Arrangement &a, uint32_t i) {
+    const uint32_t c = character(a, i);
+    const uint32_t m = (levels_[i] & 1) ? mirror(c) : 0;
+    return m != 0 ? m : c;
+  }
+
+  Arrangement &identity() {
+    Arrangement &a = sets_[0];
+    for (uint32_t i = 0; i < n_; ++i) a.from[i] = i, a.mirrored[i] = 0;
+    return a;
+  }
+
+  // Classes and brackets of the characters as arranged, then their levels
+  // and display order. Ill-formed input counts as ON.
+  int resolve_arrangement(const Arrangement &a, int direction) {
+    for (uint32_t i = 0; i < n_; ++i) {
+      const bool illFormed = chars_[a.from[i]] & kIllFormed;
+      const CharProperties &p = text_.properties(character(a, i));
+      classes_[i] = illFormed ? uint8_t{ON} : p.bidiClass;
+      brackets_[i] = illFormed ? 0 : p.bracket;
+    }
+    return bidi::resolve({classes_, brackets_, n_}, direction, levels_, order_, work_);
+  }
+
+  // The display order of a resolved arrangement, odd levels mirrored.
+  void display(const Arrangement &a, Arrangement &shown) {
+    for (uint32_t v = 0; v < n_; ++v) {
+      const uint32_t i = order_[v];
+      const bool mirrorHere = (levels_[i] & 1) && mirror(character(a, i)) != 0;
+      shown.from[v] = a.from[i];
+      shown.mirrored[v] = a.mirrored[i] != mirrorHere;
+    }
+  }
+
+  Text text_;
+  const uint8_t *source_;
+  module::WorkBuffer<2048> buffer_;
+  uint32_t n_ = 0;
+  uint32_t *offsets_ = nullptr, *chars_ = nullptr, *order_ = nullptr, *brackets_ = nullptr;
+  uint8_t *classes_ = nullptr, *levels_ = nullptr;
+  void *work_ = nullptr;
+  Arrangement sets_[3] = {};
+};
+
+template <typename Text, bool kLogical>
 int64_t reorder(const NLSSMHandle *handle, const uint8_t *source, int64_t sourceBytes,
                 uint8_t *destination, int64_t capacity, int64_t *written, uint8_t *direction) {
   if (written != nullptr) *written = 0;
@@ -265,89 +432,43 @@ int64_t reorder(const NLSSMHandle *handle, const uint8_t *source, int64_t source
   if (sourceBytes == 0) return NLSSM_OK;
   if (sourceBytes / Text::kMinSize >= 0x7FFFFFFF) return NLSSM_E_NO_MEMORY;
 
-  // Work area: order, offsets (one more), substitutes and bracket words (4
-  // bytes each), the resolution's work, then classes and levels.
-  const uint64_t most = static_cast<uint64_t>((sourceBytes + Text::kMinSize - 1) / Text::kMinSize);
-  const uint64_t words = 4 * most + 2;
-  const uint64_t bytes = 4 * words + work_bytes(most) + 2 * most + 8;
-  module::WorkBuffer<2048> buffer;
-  if (!buffer.reserve(handle, bytes)) return NLSSM_E_NO_MEMORY;
-  auto *order = reinterpret_cast<uint32_t *>(buffer.data());
-  uint32_t *offsets = order + most;
-  uint32_t *substitutes = offsets + most + 1;
-  uint32_t *brackets = substitutes + most;
-  void *work = order + words;  // an even word count: 8-byte aligned
-  uint8_t *classes = static_cast<uint8_t *>(work) + work_bytes(most);
-  uint8_t *levels = classes + most;
-
-  Text text(handle);
-  int64_t status = NLSSM_OK;
-  uint32_t n = 0;
-  for (int64_t at = 0; at < sourceBytes; ++n) {
-    const Decoded d = Text::decode(source + at, sourceBytes - at);
-    offsets[n] = static_cast<uint32_t>(at);
-    if (d.status != NLSSM_OK) {
-      if (status == NLSSM_OK) status = d.status;
-      classes[n] = ON;
-      brackets[n] = 0;
-      substitutes[n] = kAlways | d.character;
-    } else {
-      const CharProperties &p = text.properties(d.character);
-      classes[n] = p.bidiClass;
-      brackets[n] = p.bracket;
-      substitutes[n] = p.mirror;
-    }
-    at += d.size;
-  }
-  offsets[n] = static_cast<uint32_t>(sourceBytes);
-
-  const Line line{classes, brackets, n};
-  *direction = static_cast<uint8_t>(resolve(line, requested, levels, order, work));
-
+  Reorderer<Text> line(handle, source);
+  if (!line.reserve(handle,
+                    static_cast<uint64_t>((sourceBytes + Text::kMinSize - 1) / Text::kMinSize)))
+    return NLSSM_E_NO_MEMORY;
+  const int64_t decoded = line.decode(sourceBytes);
+  Arrangement *result = &line.scratch();
+  const int paragraph =
+      kLogical ? line.logical(requested, result) : line.visual(requested, *result);
+  *direction = static_cast<uint8_t>(paragraph);
   int64_t out = 0;
-  for (uint32_t v = 0; v < n; ++v) {
-    const uint32_t i = order[v];
-    const uint32_t substitute = substitutes[i];
-    uint8_t encoded[8];
-    const uint8_t *bytesOf = source + offsets[i];
-    int64_t size = offsets[i + 1] - offsets[i];
-    if ((substitute & kAlways) || (substitute != 0 && (levels[i] & 1))) {
-      size = Text::encode(substitute & ~kAlways, encoded);
-      bytesOf = encoded;
-    }
-    if (size > capacity - out) {
-      status = NLSSM_E_DEST_TOO_SMALL;
-      break;
-    }
-    std::memcpy(destination + out, bytesOf, static_cast<std::size_t>(size));
-    out += size;
-  }
+  const int64_t status = line.write(*result, destination, capacity, out);
   if (written != nullptr) *written = out;
-  return status;
+  return status != NLSSM_OK ? status : decoded;
 }
 
-// Both directions run the same transformation: a displayed line is resolved
-// as if it were in reading order and its runs are reversed back, which
-// restores the reading order of every run that resolves alike in both
-// orders.
 using Reorder = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, uint8_t *, int64_t,
                             int64_t *, uint8_t *);
 
 // The member for a handle: UTF-8 (encoding 20) or UTF-EBCDIC in class 1,
 // big-endian units for encodings 24 and 26.
+template <bool kLogical>
 Reorder utf_member(const NLSSMHandle *handle) {
-  return handle != nullptr && handle->encodingNumber != NLSSM_ENC_UTF8 ? &reorder<UtfeText>
-                                                                       : &reorder<Utf8Text>;
+  return handle != nullptr && handle->encodingNumber != NLSSM_ENC_UTF8
+             ? &reorder<UtfeText, kLogical>
+             : &reorder<Utf8Text, kLogical>;
 }
+template <bool kLogical>
 Reorder wcs2_member(const NLSSMHandle *handle) {
   return handle != nullptr && handle->encodingNumber == NLSSM_ENC_WCS2_BE
-             ? &reorder<Utf16Text<true>>
-             : &reorder<Utf16Text<false>>;
+             ? &reorder<Utf16Text<true>, kLogical>
+             : &reorder<Utf16Text<false>, kLogical>;
 }
+template <bool kLogical>
 Reorder wcs4_member(const NLSSMHandle *handle) {
   return handle != nullptr && handle->encodingNumber == NLSSM_ENC_WCS4_BE
-             ? &reorder<Utf32Text<true>>
-             : &reorder<Utf32Text<false>>;
+             ? &reorder<Utf32Text<true>, kLogical>
+             : &reorder<Utf32Text<false>, kLogical>;
 }
 
 }  // namespace
@@ -358,50 +479,50 @@ extern "C" {
 int64_t NLSVisualOrderFormat_SBCS(const NLSSMHandle *handle, const uint8_t *source,
                                   int64_t sourceBytes, uint8_t *destination, int64_t capacity,
                                   int64_t *written, uint8_t *direction) {
-  return nlssm::bidi::reorder<nlssm::bidi::SbcsText>(handle, source, sourceBytes, destination,
-                                                     capacity, written, direction);
+  return nlssm::bidi::reorder<nlssm::bidi::SbcsText, false>(
+      handle, source, sourceBytes, destination, capacity, written, direction);
 }
 int64_t NLSLogicalOrderFormat_SBCS(const NLSSMHandle *handle, const uint8_t *source,
                                    int64_t sourceBytes, uint8_t *destination, int64_t capacity,
                                    int64_t *written, uint8_t *direction) {
-  return nlssm::bidi::reorder<nlssm::bidi::SbcsText>(handle, source, sourceBytes, destination,
-                                                     capacity, written, direction);
+  return nlssm::bidi::reorder<nlssm::bidi::SbcsText, true>(handle, source, sourceBytes, destination,
+                                                           capacity, written, direction);
 }
 int64_t NLSVisualOrderFormat_UTF8(const NLSSMHandle *handle, const uint8_t *source,
                                   int64_t sourceBytes, uint8_t *destination, int64_t capacity,
                                   int64_t *written, uint8_t *direction) {
-  return nlssm::bidi::utf_member(handle)(handle, source, sourceBytes, destination, capacity,
-                                         written, direction);
+  return nlssm::bidi::utf_member<false>(handle)(handle, source, sourceBytes, destination, capacity,
+                                                written, direction);
 }
 int64_t NLSLogicalOrderFormat_UTF8(const NLSSMHandle *handle, const uint8_t *source,
                                    int64_t sourceBytes, uint8_t *destination, int64_t capacity,
                                    int64_t *written, uint8_t *direction) {
-  return nlssm::bidi::utf_member(handle)(handle, source, sourceBytes, destination, capacity,
-                                         written, direction);
+  return nlssm::bidi::utf_member<true>(handle)(handle, source, sourceBytes, destination, capacity,
+                                               written, direction);
 }
 int64_t NLSVisualOrderFormat_WCS2(const NLSSMHandle *handle, const uint8_t *source,
                                   int64_t sourceBytes, uint8_t *destination, int64_t capacity,
                                   int64_t *written, uint8_t *direction) {
-  return nlssm::bidi::wcs2_member(handle)(handle, source, sourceBytes, destination, capacity,
-                                          written, direction);
+  return nlssm::bidi::wcs2_member<false>(handle)(handle, source, sourceBytes, destination, capacity,
+                                                 written, direction);
 }
 int64_t NLSLogicalOrderFormat_WCS2(const NLSSMHandle *handle, const uint8_t *source,
                                    int64_t sourceBytes, uint8_t *destination, int64_t capacity,
                                    int64_t *written, uint8_t *direction) {
-  return nlssm::bidi::wcs2_member(handle)(handle, source, sourceBytes, destination, capacity,
-                                          written, direction);
+  return nlssm::bidi::wcs2_member<true>(handle)(handle, source, sourceBytes, destination, capacity,
+                                                written, direction);
 }
 int64_t NLSVisualOrderFormat_WCS4(const NLSSMHandle *handle, const uint8_t *source,
                                   int64_t sourceBytes, uint8_t *destination, int64_t capacity,
                                   int64_t *written, uint8_t *direction) {
-  return nlssm::bidi::wcs4_member(handle)(handle, source, sourceBytes, destination, capacity,
-                                          written, direction);
+  return nlssm::bidi::wcs4_member<false>(handle)(handle, source, sourceBytes, destination, capacity,
+                                                 written, direction);
 }
 int64_t NLSLogicalOrderFormat_WCS4(const NLSSMHandle *handle, const uint8_t *source,
                                    int64_t sourceBytes, uint8_t *destination, int64_t capacity,
                                    int64_t *written, uint8_t *direction) {
-  return nlssm::bidi::wcs4_member(handle)(handle, source, sourceBytes, destination, capacity,
-                                          written, direction);
+  return nlssm::bidi::wcs4_member<true>(handle)(handle, source, sourceBytes, destination, capacity,
+                                                written, direction);
 }
 
 }  // extern "C"
