@@ -282,7 +282,8 @@ class Reorderer {
     return true;
   }
 
-  // Decodes the source: the first status of ill-formed input, else 0.
+  // Decodes the source, with the classes and brackets of the characters as
+  // they stand: the first status of ill-formed input, else 0.
   int64_t decode(int64_t sourceBytes) {
     int64_t status = NLSSM_OK;
     n_ = 0;
@@ -290,9 +291,15 @@ class Reorderer {
       const Decoded d = Text::decode(source_ + at, sourceBytes - at);
       offsets_[n_] = static_cast<uint32_t>(at);
       chars_[n_] = d.character;
+      classes_[n_] = ON;
+      brackets_[n_] = 0;
       if (d.status != NLSSM_OK) {
         if (status == NLSSM_OK) status = d.status;
         chars_[n_] |= kIllFormed;
+      } else {
+        const CharProperties &p = text_.properties(d.character);
+        classes_[n_] = p.bidiClass;
+        brackets_[n_] = p.bracket;
       }
       at += d.size;
     }
@@ -302,9 +309,9 @@ class Reorderer {
 
   // Reading order to display order: the source as it stands, resolved.
   int visual(int direction, Arrangement &shown) {
-    Arrangement &source = identity();
-    const int paragraph = resolve_arrangement(source, direction);
-    display(source, shown);
+    const int paragraph =
+        bidi::resolve({classes_, brackets_, n_}, direction, levels_, order_, work_);
+    display(identity(), shown);
     return paragraph;
   }
 
