@@ -1068,7 +1068,8 @@ NLSSM_API int64_t NLSGetBaseDirection_MBCS(const NLSSMHandle *handle, const uint
  * lengths count as 0. Null handle or direction, or a null buffer with a
  * positive length: NLSSM_E_NULL_ARGUMENT. The work area (about 70 bytes per
  * character) comes from the handle's pool beyond 2 KiB: NLSSM_E_NO_MEMORY
- * when the pool refuses. The source and destination must not overlap. */
+ * when the pool refuses, and for a text of 2 GiB or more. The source and
+ * destination must not overlap. */
 NLSSM_API int64_t NLSVisualOrderFormat_SBCS(const NLSSMHandle *handle, const uint8_t *source,
                                             int64_t sourceBytes, uint8_t *destination, int64_t capacity,
                                             int64_t *written, uint8_t *direction);

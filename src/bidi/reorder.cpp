@@ -437,7 +437,7 @@ int64_t reorder(const NLSSMHandle *handle, const uint8_t *source, int64_t source
   const int requested = *direction;
   *direction = requested == 1 ? 1 : 0;
   if (sourceBytes == 0) return NLSSM_OK;
-  if (sourceBytes / Text::kMinSize >= 0x7FFFFFFF) return NLSSM_E_NO_MEMORY;
+  if (sourceBytes >= 0x7FFFFFFF) return NLSSM_E_NO_MEMORY;  // offsets are 32-bit
 
   Reorderer<Text> line(handle, source);
   if (!line.reserve(handle,

@@ -50,10 +50,19 @@ INSTANTIATE_TEST_SUITE_P(
         Case{87, "\xC1\x41", 0, 0, "EBCDIC Hebrew page: A before alef"},
         Case{29, "\xE0\xE1", 0, 0, "a page without a table"},
         Case{20, "12 \xD7\x90", 0, 0, "steps of one byte: the lead D7 reads as 'W'"},
-        Case{20, "\xD7\x90" "abc", 0, 1, "steps of two bytes from a Hebrew start"},
+        Case{20,
+             "\xD7\x90"
+             "abc",
+             0, 1, "steps of two bytes from a Hebrew start"},
         Case{20, "\xC2\xA0\xD7\x90", 0, 1, "no-break space, then alef, two bytes each"},
-        Case{20, "\xC2\xA0" "1\xD7\x90", 0, 0, "'1' and D7 make U+0497, a letter"},
-        Case{20, "\xE2\x82\xAC" "1", kBad, 0, "three-byte steps run past the end"},
+        Case{20,
+             "\xC2\xA0"
+             "1\xD7\x90",
+             0, 0, "'1' and D7 make U+0497, a letter"},
+        Case{20,
+             "\xE2\x82\xAC"
+             "1",
+             kBad, 0, "three-byte steps run past the end"},
         Case{161, "\x41\x42", 0, 0, "UTF-EBCDIC is not scanned"},
         Case{24, std::string("\x00\x31\x05\xD0", 4), 0, 1, "big-endian digit, alef"},
         Case{25, std::string("\x31\x00\xD0\x05", 4), 0, 1, "little-endian digit, alef"},

@@ -16,10 +16,14 @@ namespace bidi_test {
 
 using Bytes = std::vector<uint8_t>;
 
+inline nlssm::refhost::ReferenceHost &host() {
+  static auto started = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
+  return *started;
+}
+
 inline const NLSSMHandle *handle(int encoding) {
-  static auto host = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
   NLSSMHandle *h = nullptr;
-  return host->create_handle(encoding, &h) == 0 ? h : nullptr;
+  return host().create_handle(encoding, &h) == 0 ? h : nullptr;
 }
 
 using Reorder = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, uint8_t *, int64_t,

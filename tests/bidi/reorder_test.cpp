@@ -271,6 +271,24 @@ TEST(Reorder, WritesWhatFitsWithoutSplittingACharacter) {
             NLSSM_E_NULL_ARGUMENT);
 }
 
+// A line whose work area outgrows the stack takes it from the handle's pool
+// and gives it back; a refusal is reported and nothing is written.
+TEST(Reorder, WorkAreaFromThePoolIsGivenBack) {
+  const NLSSMHandle *h = handle(25);
+  const Text text(300, 0x05D0);
+  const Bytes line = encode(25, text);
+  const auto before = nlssm::refhost::PoolRegistry::counts_of(h->pool);
+  host().pools().fail_all_allocations(true);
+  const Reordered refused = reorder(h, line, 2);
+  host().pools().fail_all_allocations(false);
+  EXPECT_EQ(refused.status, NLSSM_E_NO_MEMORY);
+  EXPECT_TRUE(refused.text.empty());
+  EXPECT_EQ(reorder(h, line, 2, false).text, line);
+  const auto after = nlssm::refhost::PoolRegistry::counts_of(h->pool);
+  EXPECT_EQ(after.allocations, before.allocations);
+  EXPECT_EQ(after.bytes, before.bytes);
+}
+
 TEST(Reorder, IllFormedInputBecomesReplacementCharacters) {
   struct Case {
     int encoding;
