@@ -2399,8 +2399,8 @@ NLSSM_API int64_t NLSGetBaseDirection_MBCS(const NLSSMHandle *handle, const uint
  *     displays as that line (with the same paragraph level). The first
  *     attempt is the line resolved as if it were in reading order with its
  *     runs reversed (and mirrored) back; while an attempt does not display as
- *     the line, up to 8 more each undo the display order the previous one
- *     resolved to. When none does, the first attempt is the result (status
+ *     the line, the next undoes the display order it resolved to, up to 8
+ *     attempts in all. When none does, the first attempt is the result (status
  *     0 all the same): a line may have no reading order that displays as it.
  *     Words of either direction with blanks between them come back exactly
  *     as they were written; in general a line can come from several reading

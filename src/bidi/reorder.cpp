@@ -18,10 +18,8 @@
 namespace nlssm::bidi {
 namespace {
 
+// The stand-in for ill-formed input.
 constexpr uint32_t kReplacement = 0xFFFD;
-// Substitute word of a character: 0, a mirror image shown at odd levels, or
-// kAlways with the character that stands in for ill-formed input.
-constexpr uint32_t kAlways = 0x80000000u;
 
 struct Decoded {
   uint32_t character;
@@ -251,8 +249,8 @@ struct SbcsText {
 
 // ---- The operation -------------------------------------------------------------
 
-// Refinements a logical-order request tries before it settles for its
-// first attempt.
+// Attempts, the first included, that a logical-order request makes before it
+// settles for its first.
 constexpr int kAttempts = 8;
 
 // A line's characters in some order: position i shows source character
@@ -349,6 +347,7 @@ class Reorderer {
     return paragraph;
   }
 
+  // Room for the display order of a visual request.
   Arrangement &scratch() { return sets_[2]; }
 
   // Writes an arrangement: what fits, no character split. NLSSM_OK or
