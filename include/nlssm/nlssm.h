@@ -981,19 +981,1756 @@ NLSSM_API int64_t ToUTFE(const NLSSMHandle *handle, uint32_t codePoint, uint8_t 
 NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string, int64_t count,
                               int64_t reserved, int64_t *byteCount, uint32_t *state);
 
+/* ---- UTF-8 toolkit ---- */
+/* Standalone UTF-8 string functions over (text, byteLength) pairs; a text
+ * may be null only when its length is 0. Text is judged by Unicode's rule
+ * for well-formed UTF-8 (no overlong forms, surrogates or code points above
+ * U+10FFFF). An ill-formed stretch counts as one character: its maximal
+ * subpart, the longest start of a well-formed sequence that it is, or a
+ * single byte when its first byte starts none (the bytes a decoder replaces
+ * by one U+FFFD). u8Length and qvzsu8ByteLength (above, with the counting
+ * members) instead trust each first byte. */
+
+/* The length of the longest well-formed start of the text: byteLength when
+ * the whole text is well formed, else the offset of the first byte of the
+ * first ill-formed sequence (a sequence cut short by the end of the text is
+ * ill formed). -1 for a negative length, or a null text that has bytes. */
+NLSSM_API int64_t qvzsu8Validate(const uint8_t *text, int64_t byteLength);
+/* The number of characters in the text. -1 for bad arguments. */
+NLSSM_API int64_t qvzsu8Length(const uint8_t *text, int64_t byteLength);
+/* The byte offset of character charIndex (0-based); byteLength when
+ * charIndex is the number of characters; -1 when it is more, negative, or
+ * the arguments are bad. */
+NLSSM_API int64_t qvzsu8Offset(const uint8_t *text, int64_t byteLength, int64_t charIndex);
+
+/* Options of the case mappings: the full mappings (one character to up to
+ * three: U+00DF to "SS" in upper case and "ss" folded, U+0130 to "i" and
+ * U+0307 in lower case), rather than the simple one-to-one mappings. */
+#define QVZSU8_FULL 1u
+/* Upper case, lower case and case folding of src into dst. Mappings are
+ * those of the Unicode character database without language or context
+ * (final sigma is not treated apart). The destination must not overlap the
+ * source. A character's mapping is stored whole or not at all; once one
+ * does not fit, nothing more is stored. *written (if not null) gets the
+ * bytes stored; *needed (if not null) the bytes the whole mapping takes, so
+ * *needed - byteLength is the change in length, and dst may be null with
+ * capacity 0 to ask for it. Ill-formed stretches are copied unchanged.
+ * Returns 0; 0x803fe807 when the mapping did not fit; 0x803fe808 when it
+ * fitted but the source holds ill-formed UTF-8; 0x803fe818 for a negative
+ * capacity or length; 0x803fe82a for a null src or dst that has bytes;
+ * 0x803fe82e for options other than QVZSU8_FULL. */
+NLSSM_API int64_t qvzsu8Upper(uint8_t *dst, int64_t capacity, const uint8_t *src,
+                              int64_t byteLength, uint32_t options, int64_t *written,
+                              int64_t *needed);
+NLSSM_API int64_t qvzsu8Lower(uint8_t *dst, int64_t capacity, const uint8_t *src,
+                              int64_t byteLength, uint32_t options, int64_t *written,
+                              int64_t *needed);
+NLSSM_API int64_t qvzsu8Fold(uint8_t *dst, int64_t capacity, const uint8_t *src, int64_t byteLength,
+                             uint32_t options, int64_t *written, int64_t *needed);
+/* The simple upper-case, lower-case and folded form of one code point;
+ * code points without one (and values that are not code points) map to
+ * themselves. */
+NLSSM_API uint32_t qvzsu8UpperChar(uint32_t codePoint);
+NLSSM_API uint32_t qvzsu8LowerChar(uint32_t codePoint);
+NLSSM_API uint32_t qvzsu8FoldChar(uint32_t codePoint);
+
+/* Order of two texts: -1, 0 or 1. qvzsu8Compare orders the bytes, which for
+ * well-formed UTF-8 is code point order, and a text before any longer text
+ * it begins. qvzsu8CaseCompare orders the texts' full case foldings the
+ * same way, so "STRASSE", "strasse" and "stra" U+00DF "e" are equal; ill-formed
+ * stretches compare as their bytes. A null text or a negative length counts
+ * as empty. */
+NLSSM_API int64_t qvzsu8Compare(const uint8_t *a, int64_t aLength, const uint8_t *b,
+                                int64_t bLength);
+NLSSM_API int64_t qvzsu8CaseCompare(const uint8_t *a, int64_t aLength, const uint8_t *b,
+                                    int64_t bLength);
+/* The byte offset of the first occurrence of pattern in text, 0 for an
+ * empty pattern, -1 when there is none or the arguments are bad. Matching
+ * is binary; a well-formed pattern only matches at character boundaries of
+ * well-formed text. */
+NLSSM_API int64_t qvzsu8Find(const uint8_t *text, int64_t byteLength, const uint8_t *pattern,
+                             int64_t patternLength);
+
 /* ---- Case mapping and normalization --------------------------------------- */
 
 /* ---- Equality, inequality and ordering comparison ------------------------- */
+/* Equality (slots 10, 52, 105). 1 when equal, else 0; every failure (a null
+ * or unpositioned operand, bad options, no work buffer) answers 0. Plain forms
+ * compare each operand from its current character to its length; S forms
+ * take byte lengths; C forms take lengths in characters (no byte limit is
+ * checked; the SBCS C member is the S member).
+ * Options: 0 folds through lowerTable and needs equal lengths; bit 1 folds
+ * through lowerTable and lets the longer operand carry trailing blanks; bit 2
+ * (bit 1 clear) folds through upperTable; any other value answers 0.
+ * SBCS, modal and non-modal members: a positive count limits both operands
+ * to count bytes when it does not exceed the shorter one. Bytes that differ
+ * at the start of a character are folded as single bytes; a character whose
+ * first bytes agree must agree whole (in modal text nothing in double-byte
+ * mode is folded). With bit 1 the longer operand's bytes from twice the
+ * common length on must be the blank byte (the bytes right after the common
+ * part are not tested). Non-modal character lengths follow the handle's
+ * lead/trail flags, or the EUC-JP (134), EUC-TW (119, 120, 159) and GB18030
+ * (205) rules. Modal descriptors start in the shift state of their charKind
+ * and must start in the same one.
+ * UTF-8 members (the C member reads UTF-EBCDIC on UTF-EBCDIC handles): fold
+ * through the host's default case folding, read only option bit 1, and take
+ * a positive count as a number of characters of each operand; with bit 1 the
+ * rest of the longer operand must be blank bytes. A malformed sequence equals
+ * only identical bytes.
+ * Generic members (WCS2, WCS4): copy both operands into work buffers (1024
+ * bytes each on the stack, else the handle's pool) and lower-case them there
+ * through the owner's character query; count in bytes; two empty operands are
+ * not equal; with bit 1 the rest of the longer operand must be whole blank
+ * units. */
+NLSSM_API int64_t NLSStringEquals_SBCS(const NLSSMHandle *handle, const NLSString *a,
+                                       const NLSString *b, int64_t count, int32_t options);
+NLSSM_API int64_t NLSStringEqualsS_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                        int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                        int32_t options);
+NLSSM_API int64_t NLSStringEqualsC_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                        int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                        int32_t options);
+NLSSM_API int64_t NLSStringEquals_UTF8(const NLSSMHandle *handle, const NLSString *a,
+                                       const NLSString *b, int64_t count, int32_t options);
+NLSSM_API int64_t NLSStringEqualsS_UTF8(const NLSSMHandle *handle, const uint8_t *a,
+                                        int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                        int32_t options);
+NLSSM_API int64_t NLSStringEqualsC_UTF8(const NLSSMHandle *handle, const uint8_t *a,
+                                        int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                        int32_t options);
+NLSSM_API int64_t NLSStringEquals(const NLSSMHandle *handle, const NLSString *a, const NLSString *b,
+                                  int64_t count, int32_t options);
+NLSSM_API int64_t NLSStringEqualsS(const NLSSMHandle *handle, const uint8_t *a, int64_t lengthA,
+                                   const uint8_t *b, int64_t lengthB, int32_t options);
+NLSSM_API int64_t NLSStringEqualsC(const NLSSMHandle *handle, const uint8_t *a, int64_t lengthA,
+                                   const uint8_t *b, int64_t lengthB, int32_t options);
+NLSSM_API int64_t NLSStringEquals_MBCS_modal(const NLSSMHandle *handle, const NLSString *a,
+                                             const NLSString *b, int64_t count, int32_t options);
+NLSSM_API int64_t NLSStringEqualsS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                              int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                              int32_t options);
+NLSSM_API int64_t NLSStringEqualsC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                              int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                              int32_t options);
+NLSSM_API int64_t NLSStringEquals_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *a,
+                                                const NLSString *b, int64_t count, int32_t options);
+NLSSM_API int64_t NLSStringEqualsS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *a,
+                                                 int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                                 int32_t options);
+NLSSM_API int64_t NLSStringEqualsC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *a,
+                                                 int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                                 int32_t options);
+
+/* Inequality (slots 36, 61, 37, 62): the position of the first character of
+ * the string that is not one of the characters of the set, or -1 when there
+ * is none (an empty string gives -1). A null or unpositioned operand gives 0.
+ * Plain forms: the string from its current character, limited to `count`
+ * characters when positive; the set from its current character, limited to
+ * `setLength` characters when positive. S forms take byte lengths.
+ * SBCS: byte offsets; an empty set gives 0 for a non-empty string, and the S
+ * member gives 0 for a set length of 0. The other members walk characters of
+ * their class (UTF-8 on UTF-8 handles and UTF-EBCDIC on UTF-EBCDIC handles,
+ * WCS2 surrogate pairs, modal shift states, non-modal lead bytes as Equals)
+ * and answer character positions; a character is in the set when the set
+ * holds the same bytes in the same shift mode. UTF-8 positions count the
+ * bytes that can start a character (00-7F, C2-F4).
+ * Lit forms: the set is a literal in encoding 62, converted through the
+ * handle's charConverter and passed whole to the handle's NotEqual or
+ * NotEqualS slot; `options` is reserved and ignored. When the converted set
+ * cannot be had (no work buffer, conversion failure) the result is
+ * NLSSM_COUNT_NO_MEMORY. */
+NLSSM_API int64_t NLSStringNotEqual_SBCS(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t count, const NLSString *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualS_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                          int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqual_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t count, const NLSString *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualS_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                          int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqual_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t count, const NLSString *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualS_MBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                          int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqual_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t count, const NLSString *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualS_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                          int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqual_MBCS_modal(const NLSSMHandle *handle, const NLSString *string,
+                                               int64_t count, const NLSString *set,
+                                               int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                                int64_t length, const uint8_t *set,
+                                                int64_t setLength);
+NLSSM_API int64_t NLSStringNotEqualLit(const NLSSMHandle *handle, const NLSString *string,
+                                       int64_t count, const uint8_t *literal, int64_t literalLength,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringNotEqualLitS(const NLSSMHandle *handle, const uint8_t *string,
+                                        int64_t length, const uint8_t *literal,
+                                        int64_t literalLength, uint32_t options);
+
+/* Ordering (slots 24, 25, 56, 108, 23, 57, 109). A binary comparison of
+ * bytes or code units, optionally folded to one case. Result: 0 when equal,
+ * k + 1 when the first operand is greater, -(k + 1) when it is smaller; k is
+ * the byte offset from each operand's start at which the order was decided:
+ * the first differing byte, the start of the deciding unit (WCS) or, when
+ * folding UTF-8/UTF-EBCDIC, of the deciding character; where one operand ends,
+ * its length. A null or unpositioned operand gives 0 (with pad an operand
+ * without current character is empty).
+ * Options: bit 1 pads the shorter operand with blanks (the rest of the
+ * longer one decides at its first non-blank, against the blank); bit 2 folds
+ * through lowerTable (Unicode members: the owner's lower-case mapping); bit 4
+ * through upperTable (upper-case mapping) when bit 2 is clear.
+ * SBCS: a positive count limits both operands to count bytes when it does not
+ * exceed the shorter one; at a folded difference the raw bytes decide.
+ * NLSStringCompare_SBCS starts at each operand's charIndex; without folding
+ * and with pad its blank is 0x20 (ASCII sets) or 0x40 (EBCDIC), and in EBCDIC
+ * a difference in the common part gives just 1 or -1.
+ * Other classes: a positive count takes the first count characters of each
+ * operand. Multi-byte sets fold single-byte characters only (the bytes
+ * decide); modal descriptors start in the shift state of their charKind and
+ * shift sequences are passed over in the blank tail. UTF-8 and UTF-EBCDIC
+ * compare bytes (ASCII folded by its letters, other characters through the
+ * owner's query; folded values decide). WCS members compare unsigned units in
+ * their byte order; a WCS2 high surrogate equal in both is taken with the
+ * unit after it (joined, high unit above), and folded values decide.
+ * C forms take lengths in characters (no byte limit is checked); null
+ * buffers give 0. The class-1 C member reads UTF-EBCDIC on UTF-EBCDIC handles.
+ * Lit forms: the literal (encoding 62) is converted through charConverter
+ * (2048 bytes on the stack, else the handle's pool) and compared through the
+ * CompStr, CompareS or CompStrC member with the literal length as the count
+ * (plain form) or the character length (C form), so a plain-form literal is
+ * compared with as many characters of A. A null or empty literal gives 0; no
+ * work buffer or a failed conversion gives NLSSM_COUNT_NO_MEMORY. */
+NLSSM_API int64_t NLSStringCompStr_SBCS(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_SBCS(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_UTF8(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_UTF8(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_UTF8(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_UTF8(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_UTFE(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_UTFE(const NLSSMHandle *handle, const NLSString *a,
+                                        const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_UTFE(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_WCS2L(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_WCS2L(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_WCS2L(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_WCS2L(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_WCS2B(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_WCS2B(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_WCS2B(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_WCS2B(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_WCS4L(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_WCS4L(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_WCS4L(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_WCS4L(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_WCS4B(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_WCS4B(const NLSSMHandle *handle, const NLSString *a,
+                                         const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_WCS4B(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_WCS4B(const NLSSMHandle *handle, const uint8_t *a,
+                                          int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_MBCS_modal(const NLSSMHandle *handle, const NLSString *a,
+                                              const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_MBCS_modal(const NLSSMHandle *handle, const NLSString *a,
+                                              const NLSString *b, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                               int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                               uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                               int64_t lengthA, const uint8_t *b, int64_t lengthB,
+                                               uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *a,
+                                                 const NLSString *b, int64_t count,
+                                                 uint32_t options);
+NLSSM_API int64_t NLSStringCompare_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *a,
+                                                 const NLSString *b, int64_t count,
+                                                 uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *a,
+                                                  int64_t lengthA, const uint8_t *b,
+                                                  int64_t lengthB, uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *a,
+                                                  int64_t lengthA, const uint8_t *b,
+                                                  int64_t lengthB, uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                        const NLSString *a, const NLSString *b,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                        const NLSString *a, const NLSString *b,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                         const uint8_t *a, int64_t lengthA,
+                                                         const uint8_t *b, int64_t lengthB,
+                                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                         const uint8_t *a, int64_t lengthA,
+                                                         const uint8_t *b, int64_t lengthB,
+                                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                        const NLSString *a, const NLSString *b,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                        const NLSString *a, const NLSString *b,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                         const uint8_t *a, int64_t lengthA,
+                                                         const uint8_t *b, int64_t lengthB,
+                                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                         const uint8_t *a, int64_t lengthA,
+                                                         const uint8_t *b, int64_t lengthB,
+                                                         uint32_t options);
+NLSSM_API int64_t NLSStringCompStr_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                         const NLSString *a, const NLSString *b,
+                                                         int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompare_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                         const NLSString *a, const NLSString *b,
+                                                         int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringCompareS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                          const uint8_t *a, int64_t lengthA,
+                                                          const uint8_t *b, int64_t lengthB,
+                                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompStrC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                          const uint8_t *a, int64_t lengthA,
+                                                          const uint8_t *b, int64_t lengthB,
+                                                          uint32_t options);
+NLSSM_API int64_t NLSStringCompLit(const NLSSMHandle *handle, const NLSString *a,
+                                   const uint8_t *literal, int64_t literalLength, uint32_t options);
+NLSSM_API int64_t NLSStringCompLitS(const NLSSMHandle *handle, const uint8_t *a, int64_t lengthA,
+                                    const uint8_t *literal, int64_t literalLength,
+                                    uint32_t options);
+NLSSM_API int64_t NLSStringCompLitC(const NLSSMHandle *handle, const uint8_t *a, int64_t lengthA,
+                                    const uint8_t *literal, int64_t literalLength,
+                                    uint32_t options);
+NLSSM_API int64_t NLSStringCompLit_SBCS(const NLSSMHandle *handle, const NLSString *a,
+                                        const uint8_t *literal, int64_t literalLength,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringCompLitS_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *literal,
+                                         int64_t literalLength, uint32_t options);
+NLSSM_API int64_t NLSStringCompLitC_SBCS(const NLSSMHandle *handle, const uint8_t *a,
+                                         int64_t lengthA, const uint8_t *literal,
+                                         int64_t literalLength, uint32_t options);
+NLSSM_API int64_t NLSStringCompLit_MBCS_modal(const NLSSMHandle *handle, const NLSString *a,
+                                              const uint8_t *literal, int64_t literalLength,
+                                              uint32_t options);
+NLSSM_API int64_t NLSStringCompLitS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                               int64_t lengthA, const uint8_t *literal,
+                                               int64_t literalLength, uint32_t options);
+NLSSM_API int64_t NLSStringCompLitC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *a,
+                                               int64_t lengthA, const uint8_t *literal,
+                                               int64_t literalLength, uint32_t options);
+
 
 /* ---- Searching, classification and LIKE ----------------------------------- */
+/* Searches. Positions are 0-based and count characters from where the
+ * scan starts (for single-byte sets, bytes); -1 means not found. A match is
+ * always a run of whole characters: it starts and ends at character
+ * boundaries of the text, so a byte match inside a multi-byte character is
+ * never reported. Shift sequences of modal text are not characters: the
+ * same bytes in single- and double-byte mode are different characters.
+ *
+ * NLSStringIndex (slot 9): the first occurrence of pattern P (from its
+ * current character) in S (from its current character; single-byte sets:
+ * from charIndex). patternLength limits P (0, negative or above P's size:
+ * all of P); it counts bytes for single-byte sets and characters for every
+ * other class. -1 when either descriptor has no current character or S is
+ * empty. Single-byte sets search an empty pattern as the byte at its start
+ * (when the buffer holds one); the other classes find it at 0. */
+NLSSM_API int64_t NLSStringIndex_SBCS(const NLSSMHandle *handle, const NLSString *string,
+                                      const NLSString *pattern, int64_t patternLength);
+NLSSM_API int64_t NLSStringIndex_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                      const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_UTFE(const NLSSMHandle *handle, const NLSString *string,
+                                      const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                      const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                      const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_MBCS_modal(const NLSSMHandle *handle, const NLSString *string,
+                                            const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *string,
+                                               const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                      const NLSString *string,
+                                                      const NLSString *pattern,
+                                                      int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                      const NLSString *string,
+                                                      const NLSString *pattern,
+                                                      int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                       const NLSString *string,
+                                                       const NLSString *pattern,
+                                                       int64_t patternChars);
+/* NLSStringIndexS (slot 51): raw buffers, lengths in bytes. A pattern
+ * length of 0 gives 0; then a text length of 0 (or a null buffer) gives
+ * -1. */
+NLSSM_API int64_t NLSStringIndexS_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringLength, const uint8_t *pattern,
+                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringLength, const uint8_t *pattern,
+                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_UTFE(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringLength, const uint8_t *pattern,
+                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_WCS2(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringLength, const uint8_t *pattern,
+                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringLength, const uint8_t *pattern,
+                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t stringLength, const uint8_t *pattern,
+                                             int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *string,
+                                                int64_t stringLength, const uint8_t *pattern,
+                                                int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                       const uint8_t *string, int64_t stringLength,
+                                                       const uint8_t *pattern,
+                                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                       const uint8_t *string, int64_t stringLength,
+                                                       const uint8_t *pattern,
+                                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                        const uint8_t *string, int64_t stringLength,
+                                                        const uint8_t *pattern,
+                                                        int64_t patternLength);
+/* NLSStringIndexC (slot 104): as IndexS with lengths in characters (single-
+ * byte sets: bytes). The buffers must hold that many characters. The UTF-8
+ * member serves UTF-EBCDIC handles too, stepping by the handle's encoding;
+ * the WCS2 members serve both byte orders (encoding 24 is big-endian). */
+NLSSM_API int64_t NLSStringIndexC_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringChars, const uint8_t *pattern,
+                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringChars, const uint8_t *pattern,
+                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_WCS2(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringChars, const uint8_t *pattern,
+                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringChars, const uint8_t *pattern,
+                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t stringChars, const uint8_t *pattern,
+                                             int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *string,
+                                                int64_t stringChars, const uint8_t *pattern,
+                                                int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                       const uint8_t *string, int64_t stringChars,
+                                                       const uint8_t *pattern,
+                                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                       const uint8_t *string, int64_t stringChars,
+                                                       const uint8_t *pattern,
+                                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                        const uint8_t *string, int64_t stringChars,
+                                                        const uint8_t *pattern,
+                                                        int64_t patternChars);
+/* NLSStringContains (slot 28): Index through the handle's NLSStringIndex
+ * slot on descriptors built over the two buffers (lengths in bytes); an
+ * empty pattern or text, or a null buffer, gives -1. The options word is
+ * not read. */
+NLSSM_API int64_t NLSStringContains(const NLSSMHandle *handle, const uint8_t *string,
+                                    int64_t stringLength, const uint8_t *pattern,
+                                    int64_t patternLength, int64_t options);
+/* NLSStringFindCharLit (slot 46): the first occurrence of one character,
+ * given as a byte of the host's literal set (encoding 62), in `count`
+ * characters from the current one (0 or above the rest: to the end; single-
+ * byte sets: bytes from charIndex). The literal is converted through the
+ * handle's charConverter when it has one (single-byte sets: only EBCDIC-
+ * based ones); a failed conversion gives -1. On a match the descriptor moves
+ * to the character found (single-byte sets: charIndex and curOffset become
+ * its byte offset; UTF-EBCDIC sets charIndex, curOffset, prevOffset and
+ * nextOffset by its own sequences; the other classes position it through
+ * stringSetPos); a miss leaves it as it was. */
+NLSSM_API int64_t NLSStringFindCharLit_SBCS(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_UTF8(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_WCS2(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_WCS4(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                                  int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                                     int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_MBCS_EUC_JP(const NLSSMHandle *handle, NLSString *string,
+                                                   int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_MBCS_EUC_TW(const NLSSMHandle *handle, NLSString *string,
+                                                   int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_MBCS_GB18030(const NLSSMHandle *handle, NLSString *string,
+                                                    int64_t count, const uint8_t *literal);
+/* NLSStringFindCharLitS (slots 69, 70) and NLSStringFindCharLitC (slots 111,
+ * 112): raw buffers, length in bytes (S) or characters (C). The literal is
+ * converted from encoding 62 only when `convert` is non-zero and the handle
+ * has a converter; otherwise it is one character of the text's encoding,
+ * read as far as its first byte announces (modal text: after an optional
+ * shift sequence). reserved1 and reserved2 are not read. Nothing moves. */
+NLSSM_API int64_t NLSStringFindCharLitS_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_WCS2(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                                   int64_t length, const uint8_t *literal,
+                                                   int64_t reserved1, int64_t reserved2,
+                                                   uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                      const uint8_t *string, int64_t length,
+                                                      const uint8_t *literal, int64_t reserved1,
+                                                      int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_MBCS_EUC_JP(const NLSSMHandle *handle,
+                                                    const uint8_t *string, int64_t length,
+                                                    const uint8_t *literal, int64_t reserved1,
+                                                    int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_MBCS_EUC_TW(const NLSSMHandle *handle,
+                                                    const uint8_t *string, int64_t length,
+                                                    const uint8_t *literal, int64_t reserved1,
+                                                    int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_MBCS_GB18030(const NLSSMHandle *handle,
+                                                     const uint8_t *string, int64_t length,
+                                                     const uint8_t *literal, int64_t reserved1,
+                                                     int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_WCS2(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                                   int64_t length, const uint8_t *literal,
+                                                   int64_t reserved1, int64_t reserved2,
+                                                   uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                      const uint8_t *string, int64_t length,
+                                                      const uint8_t *literal, int64_t reserved1,
+                                                      int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_MBCS_EUC_JP(const NLSSMHandle *handle,
+                                                    const uint8_t *string, int64_t length,
+                                                    const uint8_t *literal, int64_t reserved1,
+                                                    int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_MBCS_EUC_TW(const NLSSMHandle *handle,
+                                                    const uint8_t *string, int64_t length,
+                                                    const uint8_t *literal, int64_t reserved1,
+                                                    int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_MBCS_GB18030(const NLSSMHandle *handle,
+                                                     const uint8_t *string, int64_t length,
+                                                     const uint8_t *literal, int64_t reserved1,
+                                                     int64_t reserved2, uint8_t convert);
+/* Modal text, a character already in the text's encoding (never
+ * converted): slot 70 (S) and the C form. */
+NLSSM_API int64_t NLSStringFindCharS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                                int64_t length, const uint8_t *character,
+                                                int64_t reserved1, int64_t reserved2,
+                                                uint8_t ignored);
+NLSSM_API int64_t NLSStringFindCharC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                                int64_t length, const uint8_t *character,
+                                                int64_t reserved1, int64_t reserved2,
+                                                uint8_t ignored);
+/* NLSStringVerify (slot 86): the first character of S (from its current
+ * character, `count` characters; 0 or above the rest: all) that is not one
+ * of the characters of `set` (from its current character, `setCount`
+ * likewise); -1 when every character is in the set or S is empty; 0 for an
+ * empty set and a non-empty S. Single-byte sets count bytes. The UTF-8
+ * member serves UTF-EBCDIC handles, the non-modal member every double-byte
+ * page, EUC-JP, EUC-TW and GB18030 (stepping by the handle's encoding).
+ * NLSStringVerifyS (slot 87): raw buffers, lengths in bytes. */
+NLSSM_API int64_t NLSStringVerify_SBCS(const NLSSMHandle *handle, const NLSString *string,
+                                       int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                       int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_WCS2L(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_WCS2B(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                       int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_MBCS_modal(const NLSSMHandle *handle, const NLSString *string,
+                                             int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *string,
+                                                int64_t count, const NLSString *set,
+                                                int64_t setCount);
+NLSSM_API int64_t NLSStringVerifyS_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                        int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                        int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_WCS2L(const NLSSMHandle *handle, const uint8_t *string,
+                                         int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_WCS2B(const NLSSMHandle *handle, const uint8_t *string,
+                                         int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                        int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                              int64_t length, const uint8_t *set,
+                                              int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *string,
+                                                 int64_t length, const uint8_t *set,
+                                                 int64_t setLength);
+
+/* Classification (slots 73-78): 1 when the current character is in a
+ * class of `mask` (the class-table bits: 0x01 upper, 0x02 lower, 0x04
+ * digit, 0x08 space, 0x10 punctuation, 0x20 blank, 0x40 control, 0x80
+ * hexadecimal digit), else 0; 0 when there is no current character. The
+ * count word is not read.
+ * Single-byte sets: the class table. IsSpace also takes 0x09-0x0D (ASCII)
+ * or 0x0B-0x0D (EBCDIC) as space.
+ * Multi-byte classes read the descriptor's charKind (0: no character): a
+ * single-byte character uses the class table (NLSStringIs_MBCS: byte 0x80
+ * in no class); NLSStringIs_MBCS counts any wider character in every class
+ * but punctuation (mask 0x10); IsDigit answers 0 for it; IsLower looks the
+ * double-byte code up in the double-byte case table (with mask bit 0x02:
+ * its lower form is itself, without: its upper form is); IsXDigit takes
+ * the double-byte hexadecimal ranges; IsSpace the encoding's double-byte
+ * space (and ASCII 0x09-0x0D, or EBCDIC 0x05, 0x0B-0x0D, 0x25); IsGraph
+ * counts every double-byte character but the double-byte space.
+ * Unicode (UTF-8, which also serves UTF-EBCDIC handles, WCS2, WCS4): the
+ * decoded character's general category from the host's character-
+ * information query; a high surrogate without its low one, an undecodable
+ * sequence or a failed query give 0. IsSpace takes a strict flag instead
+ * of the count and mask: U+0020, U+00A0, U+1680, U+2000-U+200A, U+2028,
+ * U+2029, U+202F, U+205F, U+3000, and unless strict also U+0009-U+000D and
+ * U+0085. IsXDigit: A-F, a-f, their full-width forms and decimal digits
+ * (mask not read). IsGraph: not a separator, control, format, surrogate or
+ * unassigned character (mask not read). */
+NLSSM_API int64_t NLSStringIs_SBCS(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_ASCII(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_EBCDIC(const NLSSMHandle *handle, const NLSString *string,
+                                          int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIs_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsLower_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsDigit_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsXDigit_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsGraph_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_MBCS_ASCII(const NLSSMHandle *handle, const NLSString *string,
+                                              int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_MBCS_EBCDIC(const NLSSMHandle *handle, const NLSString *string,
+                                               int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIs_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t strict);
+NLSSM_API int64_t NLSStringIsXDigit_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsGraph_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIs_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t strict);
+NLSSM_API int64_t NLSStringIsXDigit_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsGraph_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIs_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t strict);
+NLSSM_API int64_t NLSStringIsXDigit_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsGraph_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+/* stringAnyNot (slot 118, every class): 1 when any of `count` characters
+ * from the current one (0 or negative: all of them) is not in a class of
+ * `mask`, as the handle's NLSStringIs slot answers character by character
+ * (stepping with its stringNextChar slot); 0 when all are, or there is no
+ * character. The descriptor does not move. */
+NLSSM_API int64_t stringAnyNot(const NLSSMHandle *handle, const NLSString *string, int64_t count,
+                               int32_t mask);
+
+/* LIKE (slot 27): 1 when the whole text (from its current character)
+ * matches the pattern (from its current character), 0 when not, or
+ * NLSSM_E_NULL_ARGUMENT for a null handle or descriptor, or a null buffer
+ * under a non-empty descriptor. A descriptor without a current character
+ * holds the empty string. Matching is by whole characters: '%' matches any
+ * run of characters (also none), '_' exactly one character; with `escape`
+ * non-zero the escape character (backslash) makes the pattern character after it
+ * literal (an escape at the end of the pattern stands for itself). The
+ * three pattern characters are those of the encoding's family (ASCII % _ and
+ * backslash, EBCDIC 0x6C 0x6D 0xE0; UTF-EBCDIC uses the EBCDIC ones, wide text the
+ * units of the ASCII values), and in modal text only single-byte
+ * characters act as them. Time grows at worst with text length times
+ * pattern length. NLSStringLike_MBCS_nonmodal serves UTF-8, UTF-EBCDIC,
+ * WCS2 and WCS4 handles; the nonmodal2 members every double-byte page,
+ * EUC-JP, EUC-TW and GB18030; the modal member takes the family from the
+ * handle. */
+NLSSM_API int64_t NLSStringLike_SBCS_ASCII(const NLSSMHandle *handle, const NLSString *text,
+                                           const NLSString *pattern, int64_t escape);
+NLSSM_API int64_t NLSStringLike_SBCS_EBCDIC(const NLSSMHandle *handle, const NLSString *text,
+                                            const NLSString *pattern, int64_t escape);
+NLSSM_API int64_t NLSStringLike_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *text,
+                                              const NLSString *pattern, int64_t escape);
+NLSSM_API int64_t NLSStringLike_MBCS_modal(const NLSSMHandle *handle, const NLSString *text,
+                                           const NLSString *pattern, int64_t escape);
+NLSSM_API int64_t NLSStringLike_MBCS_nonmodal2_ASCII(const NLSSMHandle *handle,
+                                                     const NLSString *text,
+                                                     const NLSString *pattern, int64_t escape);
+NLSSM_API int64_t NLSStringLike_MBCS_nonmodal2_EBCDIC(const NLSSMHandle *handle,
+                                                      const NLSString *text,
+                                                      const NLSString *pattern, int64_t escape);
 
 /* ---- Substring, delete, reverse and strip --------------------------------- */
+/* Reverse (slots 33, 58): the order of the first n characters from the
+ * current one (0 or more than remain: all; S forms: the whole buffer), in
+ * place. Single-byte, two-byte and four-byte text swap whole units (two-byte
+ * text counts n in characters but swaps units, so a surrogate pair is turned
+ * round); multi-byte text keeps the bytes of each character in order. Modal
+ * text turns shift sequences round; a text that ends in another width than
+ * it starts gets the shift into that width in front and loses its last
+ * bytes to it. Answers 0, NLSSM_E_NO_MEMORY when the modal work buffer could
+ * not be had (the text is then unchanged), or NLSSM_E_NULL_ARGUMENT. */
+NLSSM_API int64_t NLSStringReverse_SBCS(const NLSSMHandle *handle, NLSString *string, int64_t n);
+NLSSM_API int64_t NLSStringReverseS_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t bytes);
+NLSSM_API int64_t NLSStringReverse_WCS2(const NLSSMHandle *handle, NLSString *string, int64_t n);
+NLSSM_API int64_t NLSStringReverseS_WCS2(const NLSSMHandle *handle, uint8_t *buffer, int64_t bytes);
+NLSSM_API int64_t NLSStringReverse_WCS4(const NLSSMHandle *handle, NLSString *string, int64_t n);
+NLSSM_API int64_t NLSStringReverseS_WCS4(const NLSSMHandle *handle, uint8_t *buffer, int64_t bytes);
+NLSSM_API int64_t NLSStringReverse_MBCS(const NLSSMHandle *handle, NLSString *string, int64_t n);
+NLSSM_API int64_t NLSStringReverseS_MBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t bytes);
+NLSSM_API int64_t NLSStringReverse_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                              int64_t n);
+NLSSM_API int64_t NLSStringReverseS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                               int64_t bytes);
+
+/* Delete (slots 34, 59, 35, 60): every character of the target's first n
+ * characters from its current one (0 or more than remain: all) that occurs
+ * in the list's first m characters is taken out; the kept characters close
+ * up and the freed bytes at the end of the range become blanks. Answers the
+ * characters kept (S forms: the bytes kept), 0 for an unset target, the
+ * range's character count for an unset or empty list, and
+ * NLSSM_COUNT_NO_MEMORY when a work buffer could not be had (the target is
+ * then unchanged). Flags are not used. Modal text: shift sequences are
+ * rewritten around the characters kept; a range followed by more text ends
+ * in the width it ended in before (blanks go where the width is single, or
+ * as pairs of blank bytes where it is double). The literal forms convert the
+ * literal from encoding 62 and call the handle's NLSStringDelete or
+ * NLSStringDeleteS; a literal that cannot be converted deletes nothing. */
+NLSSM_API int64_t NLSStringDelete_SBCS(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                       const NLSString *list, int64_t m, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_SBCS(const NLSSMHandle *handle, uint8_t *target,
+                                        int64_t targetBytes, const uint8_t *list,
+                                        int64_t listBytes);
+NLSSM_API int64_t NLSStringDelete_WCS2L(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                        const NLSString *list, int64_t m, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_WCS2L(const NLSSMHandle *handle, uint8_t *target,
+                                         int64_t targetBytes, const uint8_t *list,
+                                         int64_t listBytes);
+NLSSM_API int64_t NLSStringDelete_WCS2B(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                        const NLSString *list, int64_t m, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_WCS2B(const NLSSMHandle *handle, uint8_t *target,
+                                         int64_t targetBytes, const uint8_t *list,
+                                         int64_t listBytes);
+NLSSM_API int64_t NLSStringDelete_WCS4(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                       const NLSString *list, int64_t m, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_WCS4(const NLSSMHandle *handle, uint8_t *target,
+                                        int64_t targetBytes, const uint8_t *list,
+                                        int64_t listBytes);
+NLSSM_API int64_t NLSStringDelete_MBCS(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                       const NLSString *list, int64_t m, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_MBCS(const NLSSMHandle *handle, uint8_t *target,
+                                        int64_t targetBytes, const uint8_t *list,
+                                        int64_t listBytes);
+NLSSM_API int64_t NLSStringDelete_MBCS_modal(const NLSSMHandle *handle, NLSString *target,
+                                             int64_t n, const NLSString *list, int64_t m,
+                                             int64_t flags);
+NLSSM_API int64_t NLSStringDeleteS_MBCS_modal(const NLSSMHandle *handle, uint8_t *target,
+                                              int64_t targetBytes, const uint8_t *list,
+                                              int64_t listBytes);
+NLSSM_API int64_t NLSStringDeleteLit(const NLSSMHandle *handle, NLSString *target, int64_t n,
+                                     const uint8_t *literal, int64_t literalBytes, int64_t flags);
+NLSSM_API int64_t NLSStringDeleteLitS(const NLSSMHandle *handle, uint8_t *target,
+                                      int64_t targetBytes, const uint8_t *literal,
+                                      int64_t literalBytes, int64_t flags);
+
+/* Substring (slot 38): up to n characters (0 or more than remain: all) of
+ * the source from its current character, copied into the destination at its
+ * current offset (single-byte: at the charIndex of both; an unset wide or
+ * multi-byte destination is written from its start). Whole characters only:
+ * what does not fit is left out with NLSSM_E_DEST_TOO_SMALL and no padding.
+ * Flag bit 0 (NLSSM_EDIT_PAD) blank-fills the rest of an untruncated
+ * destination and takes its length to the capacity (wide text: to the last
+ * whole unit). The destination's length becomes at least the end of the
+ * copy. bytesCopied (may be null) receives the bytes written, shift
+ * sequences included. An unset source copies nothing and answers 0; a null
+ * descriptor answers NLSSM_E_NULL_ARGUMENT.
+ * Multi-byte members (UTF-8, UTF-EBCDIC, double-byte, EUC, GB18030, modal)
+ * with n of 0 hand the rest of the source to the handle's NLSStringMoveS
+ * (NLSSM_E_UNSUPPORTED when that slot is empty); afterwards the destination
+ * is positioned again through stringSetPos. Modal text keeps its shift state
+ * balanced: a shift sequence at the join when the widths differ, a closing
+ * shift-in (double-byte characters are given back to make room for it), and
+ * the rest of a source in double-byte width, or into a destination in
+ * double-byte width at the write offset, is copied character by character
+ * rather than moved. */
+NLSSM_API int64_t NLSStringSubStr_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                       NLSString *destination, int64_t n, int64_t *bytesCopied,
+                                       int64_t flags);
+NLSSM_API int64_t NLSStringSubStr_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                       NLSString *destination, int64_t n, int64_t *bytesCopied,
+                                       int64_t flags);
+NLSSM_API int64_t NLSStringSubStr_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                       NLSString *destination, int64_t n, int64_t *bytesCopied,
+                                       int64_t flags);
+NLSSM_API int64_t NLSStringSubStr_MBCS_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                            NLSString *destination, int64_t n, int64_t *bytesCopied,
+                                            int64_t flags);
+NLSSM_API int64_t NLSStringSubStr_MBCS(const NLSSMHandle *handle, const NLSString *source,
+                                       NLSString *destination, int64_t n, int64_t *bytesCopied,
+                                       int64_t flags);
+NLSSM_API int64_t NLSStringSubStr_MBCS_modal(const NLSSMHandle *handle, const NLSString *source,
+                                             NLSString *destination, int64_t n,
+                                             int64_t *bytesCopied, int64_t flags);
+
+/* Strip (slots 39, 64, 110): the length of the text up to its last
+ * character that is not a blank; nothing is moved. Flag bit 0 strips every
+ * white-space character (U+0009-000D, 0020, 0085, 00A0, 1680, 2000-200A,
+ * 2028, 2029, 202F, 205F, 3000): single-byte text by the class table's
+ * white-space bit, double-byte non-modal text the blank and the bytes 9-13,
+ * modal text the trailing bytes 0x40, 0x0E and 0x0F; UTF-8 recognises the
+ * sequences of those characters at the end (and E1 81 A8 and E1 82 8E in
+ * place of U+1680 and U+180E). Plain forms answer characters from the
+ * current one: single-byte, wide and non-modal text look at the first n
+ * characters only; UTF-8 and UTF-EBCDIC strip the whole rest and count at
+ * most n characters, or, with bit 0, all that remain; modal text stops after
+ * n characters, or with bit 0 ignores n. S forms answer bytes; C forms take
+ * and answer characters (NLSStringStripC_UTF8 serves UTF-EBCDIC handles by
+ * their own rule). Unset descriptors and null buffers answer 0. */
+NLSSM_API int64_t NLSStringStrip_SBCS(const NLSSMHandle *handle, const NLSString *string, int64_t n,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringStripS_SBCS(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_UTF8(const NLSSMHandle *handle, const NLSString *string, int64_t n,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringStripS_UTF8(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_UTFE(const NLSSMHandle *handle, const NLSString *string, int64_t n,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringStripS_UTFE(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_WCS2(const NLSSMHandle *handle, const NLSString *string, int64_t n,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringStripS_WCS2(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_WCS4(const NLSSMHandle *handle, const NLSString *string, int64_t n,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringStripS_WCS4(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_MBCS_modal(const NLSSMHandle *handle, const NLSString *string,
+                                            int64_t n, int64_t flags);
+NLSSM_API int64_t NLSStringStripS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                             int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStrip_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *string,
+                                               int64_t n, int64_t flags);
+NLSSM_API int64_t NLSStringStripS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                                int64_t bytes, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_SBCS(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t chars, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_UTF8(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t chars, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_WCS2(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t chars, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_WCS4(const NLSSMHandle *handle, const uint8_t *buffer,
+                                       int64_t chars, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                             int64_t chars, int64_t flags);
+NLSSM_API int64_t NLSStringStripC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *buffer,
+                                                int64_t chars, int64_t flags);
+
 
 /* ---- Move, fill, concatenate, justify and add quotes ---------------------- */
+/* Move (slots 63, 115): copies sourceLength bytes of source (characters
+ * with flag NLSSM_EDIT_SOURCE_IN_CHARS; the fixed-width members count units,
+ * the others whole characters, which the source must hold) into the
+ * destinationLength bytes at destination, in whole characters. Too little
+ * room: what fits is copied, 0x803fe807, no padding. Otherwise flag
+ * NLSSM_EDIT_PAD blank-pads the rest of the room. Source and destination may
+ * overlap. The double-byte non-modal members pad with the byte 0x20 and
+ * report 0x803fe807 only when something was copied. The modal member keeps
+ * shift sequences balanced: a leading shift-in and a trailing shift-out are
+ * dropped, a copy ending in a double-byte run is closed with a shift-in
+ * (double-byte characters are given back to make room for it, with
+ * 0x803fe807); the same buffer as source and destination, without padding
+ * and ending in single-byte width, is only measured. The UTF-8 member sizes
+ * UTF-EBCDIC text by its own rule. Counts (may be null): bytes written,
+ * padding excluded; characters written (units for the fixed-width members).
+ * Null buffers with a non-zero length: 0x803fe82a. */
+NLSSM_API int64_t NLSStringMoveS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *bytesWritten,
+                                           uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *bytesWritten,
+                                           int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *bytesWritten,
+                                      int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceLength, uint8_t *destination,
+                                            int64_t destinationLength, int64_t *bytesWritten,
+                                            uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceLength, uint8_t *destination,
+                                            int64_t destinationLength, int64_t *bytesWritten,
+                                            int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, uint8_t *destination,
+                                               int64_t destinationLength, int64_t *bytesWritten,
+                                               uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, uint8_t *destination,
+                                               int64_t destinationLength, int64_t *bytesWritten,
+                                               int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                      const uint8_t *source, int64_t sourceLength,
+                                                      uint8_t *destination,
+                                                      int64_t destinationLength,
+                                                      int64_t *bytesWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal_EUC_JP(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *bytesWritten, int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                      const uint8_t *source, int64_t sourceLength,
+                                                      uint8_t *destination,
+                                                      int64_t destinationLength,
+                                                      int64_t *bytesWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal_EUC_TW(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *bytesWritten, int64_t *charsWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                       const uint8_t *source, int64_t sourceLength,
+                                                       uint8_t *destination,
+                                                       int64_t destinationLength,
+                                                       int64_t *bytesWritten, uint32_t flags);
+NLSSM_API int64_t NLSStringMoveC_MBCS_nonmodal_GB18030(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *bytesWritten, int64_t *charsWritten, uint32_t flags);
+
+/* Fill (slots 44, 67, 45, 68): repeats one character, in whole characters.
+ * Descriptor forms take the character at fillChar's curOffset (an unset
+ * fillChar: nothing is done, 0) and count `written` in characters. The SBCS
+ * member writes from the byte offset charIndex: length bytes (0 = all the
+ * room up to capacity; more than the room fills the room, 0x803fe807). The
+ * others write from curOffset (the end of the text when unset): lengths of
+ * at least one character give the smaller of the characters asked and the
+ * characters that fit (0x803fe807 when fewer than asked); shorter lengths,
+ * 0 included, fill all whole characters of the room (0x803fe807 when bytes
+ * are left over). The modal member writes a double-byte character as a
+ * shift-out, the characters and a shift-in (whose bytes count in length
+ * and room). The destination's length grows to the end of the fill.
+ * Raw forms repeat the whole fillChar buffer (modal: its first character;
+ * four-byte units: at most 4 bytes) over length bytes from the start,
+ * `written` in bytes; 0x803fe807 when bytes are left over; a fill character
+ * of length 0 is 0x803fe82a. Literal forms convert the literal's first byte
+ * (encoding 62) through charConverter and call the handle's NLSStringFill
+ * or NLSStringFillS; an empty literal is 0x803fe82a. */
+NLSSM_API int64_t NLSStringFill_SBCS(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_SBCS(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_MBCS(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_MBCS(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_WCS2(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_WCS2(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_WCS4(const NLSSMHandle *handle, NLSString *destination,
+                                     int64_t length, const NLSString *fillChar, int64_t *written);
+NLSSM_API int64_t NLSStringFillS_WCS4(const NLSSMHandle *handle, uint8_t *destination,
+                                      int64_t length, const uint8_t *fillChar, int64_t fillLength,
+                                      int64_t *written);
+NLSSM_API int64_t NLSStringFill_MBCS_modal(const NLSSMHandle *handle, NLSString *destination,
+                                           int64_t length, const NLSString *fillChar,
+                                           int64_t *written);
+NLSSM_API int64_t NLSStringFillS_MBCS_modal(const NLSSMHandle *handle, uint8_t *destination,
+                                            int64_t length, const uint8_t *fillChar,
+                                            int64_t fillLength, int64_t *written);
+NLSSM_API int64_t NLSStringFillLit(const NLSSMHandle *handle, NLSString *destination,
+                                   int64_t length, const uint8_t *literal, int64_t literalLength,
+                                   int64_t *written);
+NLSSM_API int64_t NLSStringFillLitS(const NLSSMHandle *handle, uint8_t *destination, int64_t length,
+                                    const uint8_t *literal, int64_t literalLength,
+                                    int64_t *written);
+
+/* Concatenate (slots 43, 66): joins `count` pieces (variable arguments:
+ * NLSString pointers for the descriptor forms, from each one's curOffset to
+ * its length, a null or unset one ending the list; (const uint8_t *, int64_t
+ * bytes) pairs for the raw forms) into the destination, with the separator
+ * literal's first byte (encoding 62, converted through charConverter) between
+ * pieces when separatorLength is not 0. Room: *length (descriptor forms; 0 =
+ * up to capacity) or length bytes; a negative length is terminated mode,
+ * room -length - 1 and a zero byte after the text instead of blank padding.
+ * The descriptor forms never write past capacity and write from the byte
+ * offset charIndex (NLSStringConcat, single-byte and UTF-8) or from curOffset
+ * (the others; negative counts as 0). A piece longer than the room left
+ * ends the join with 0x803fe807 after copying what fits in whole characters,
+ * or nothing of it with flag NLSSM_EDIT_PAD; a separator taking the last
+ * byte of room before a piece also gives 0x803fe807. The rest of the room is
+ * blank-filled in normal mode, truncated or not. Modal pieces are moved as
+ * by the modal move (each left in single-byte width), and a destination whose
+ * text ends in a double-byte run at the write offset gets a shift-in first.
+ * The bytes written (separators included, padding excluded) go to *length or
+ * *written (may be null); the descriptor's length becomes the end of the text. */
+NLSSM_API int64_t NLSStringConcat(const NLSSMHandle *handle, NLSString *destination,
+                                  int64_t *length, const uint8_t *separator,
+                                  int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS(const NLSSMHandle *handle, uint8_t *destination, int64_t length,
+                                   int64_t *written, const uint8_t *separator,
+                                   int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcat_WCS2(const NLSSMHandle *handle, NLSString *destination,
+                                       int64_t *length, const uint8_t *separator,
+                                       int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS_WCS2(const NLSSMHandle *handle, uint8_t *destination,
+                                        int64_t length, int64_t *written, const uint8_t *separator,
+                                        int64_t separatorLength, uint32_t flags, int64_t count,
+                                        ...);
+NLSSM_API int64_t NLSStringConcat_WCS4(const NLSSMHandle *handle, NLSString *destination,
+                                       int64_t *length, const uint8_t *separator,
+                                       int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS_WCS4(const NLSSMHandle *handle, uint8_t *destination,
+                                        int64_t length, int64_t *written, const uint8_t *separator,
+                                        int64_t separatorLength, uint32_t flags, int64_t count,
+                                        ...);
+NLSSM_API int64_t NLSStringConcat_MBCS_modal(const NLSSMHandle *handle, NLSString *destination,
+                                             int64_t *length, const uint8_t *separator,
+                                             int64_t separatorLength, uint32_t flags, int64_t count,
+                                             ...);
+NLSSM_API int64_t NLSStringConcatS_MBCS_modal(const NLSSMHandle *handle, uint8_t *destination,
+                                              int64_t length, int64_t *written,
+                                              const uint8_t *separator, int64_t separatorLength,
+                                              uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcat_MBCS(const NLSSMHandle *handle, NLSString *destination,
+                                       int64_t *length, const uint8_t *separator,
+                                       int64_t separatorLength, uint32_t flags, int64_t count, ...);
+NLSSM_API int64_t NLSStringConcatS_MBCS(const NLSSMHandle *handle, uint8_t *destination,
+                                        int64_t length, int64_t *written, const uint8_t *separator,
+                                        int64_t separatorLength, uint32_t flags, int64_t count,
+                                        ...);
+
+/* Justify (slots 47, 71, 113): moves the text between a field's leading and
+ * trailing blanks (whole blank characters of the handle; single-byte and
+ * modal members: the first byte of blankChar, counted in single-byte width
+ * only) to its left ('L'), right ('R') or centre ('C', an odd spare blank to
+ * the right), or leaves it ('N'), in place, blanking the places it left.
+ * The low byte of align is the letter, either case; another letter gives
+ * 0x803fe835 with nothing moved. Results (each may be null): the text's
+ * length and its new start in bytes, and in the C form also in characters.
+ * An empty or all-blank field gives 0 in every result and status 0. The
+ * descriptor form justifies from the buffer's start to length and first
+ * moves a cursor that is not at character 0 there; the S form takes a byte
+ * length, the C form a length in characters (the buffer must hold them); a
+ * negative length is an empty field. NLSStringJustifyC_UTF8 serves UTF-8 and
+ * UTF-EBCDIC, the WCS2 members both byte orders. */
+NLSSM_API int64_t NLSStringJustify(const NLSSMHandle *handle, NLSString *string, uint32_t align,
+                                   int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                    uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                    uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                    int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_UTF8(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustify_UTFE(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_UTFE(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_WCS2(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_WCS2(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_WCS2(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_WCS4(const NLSSMHandle *handle, NLSString *string,
+                                        uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_WCS4(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_WCS4(const NLSSMHandle *handle, uint8_t *buffer, int64_t length,
+                                         uint32_t align, int64_t *textBytes, int64_t *textChars,
+                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                              uint32_t align, int64_t *textLength,
+                                              int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                               int64_t length, uint32_t align, int64_t *textLength,
+                                               int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                               int64_t length, uint32_t align, int64_t *textBytes,
+                                               int64_t *textChars, int64_t *startBytes,
+                                               int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                                 uint32_t align, int64_t *textLength,
+                                                 int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                  int64_t length, uint32_t align,
+                                                  int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                  int64_t length, uint32_t align,
+                                                  int64_t *textBytes, int64_t *textChars,
+                                                  int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                        NLSString *string, uint32_t align,
+                                                        int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textBytes, int64_t *textChars,
+                                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                        NLSString *string, uint32_t align,
+                                                        int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                         int64_t length, uint32_t align,
+                                                         int64_t *textBytes, int64_t *textChars,
+                                                         int64_t *startBytes, int64_t *startChars);
+NLSSM_API int64_t NLSStringJustify_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                         NLSString *string, uint32_t align,
+                                                         int64_t *textLength, int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                          uint8_t *buffer, int64_t length,
+                                                          uint32_t align, int64_t *textLength,
+                                                          int64_t *textStart);
+NLSSM_API int64_t NLSStringJustifyC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                          uint8_t *buffer, int64_t length,
+                                                          uint32_t align, int64_t *textBytes,
+                                                          int64_t *textChars, int64_t *startBytes,
+                                                          int64_t *startChars);
+
+/* Add quotes (slots 42, 65): writes the quote character (quoteChar in
+ * quoteWidth bytes; single-byte and modal members: its first byte), the
+ * source with every quote character doubled, and a closing quote. The
+ * descriptor form quotes n characters from the source's curOffset (0 or
+ * more than there are: all; an unset source is empty text) into the
+ * destination's capacity from its buffer's start, and sets the
+ * destination's length to the bytes written. Characters are copied whole; a
+ * quote and its double are written together or not at all; modal runs keep
+ * room for the shift-in that closes them. Done: status 0 and *resultLength
+ * the bytes written. Too little room: 0x803fe807, the destination holds
+ * what fit, and *resultLength is minus the bytes the whole quoted text
+ * needs. Overlapping source and destination are quoted through a work
+ * buffer (2048 bytes on the stack, the handle's pool beyond; a pool that
+ * refuses cuts the room to 2048 bytes). */
+NLSSM_API int64_t NLSStringAddQuotes(const NLSSMHandle *handle, const NLSString *source, int64_t n,
+                                     NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS(const NLSSMHandle *handle, const uint8_t *source,
+                                      int64_t sourceLength, uint8_t *destination,
+                                      int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_UTFE(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_UTFE(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_modal(const NLSSMHandle *handle, const NLSString *source,
+                                                int64_t n, NLSString *destination,
+                                                int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                                 int64_t sourceLength, uint8_t *destination,
+                                                 int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                   const NLSString *source, int64_t n,
+                                                   NLSString *destination, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                    const uint8_t *source, int64_t sourceLength,
+                                                    uint8_t *destination, int64_t destinationLength,
+                                                    int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                          const NLSString *source, int64_t n,
+                                                          NLSString *destination,
+                                                          int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal_EUC_JP(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                          const NLSString *source, int64_t n,
+                                                          NLSString *destination,
+                                                          int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal_EUC_TW(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotes_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                           const NLSString *source, int64_t n,
+                                                           NLSString *destination,
+                                                           int64_t *resultLength);
+NLSSM_API int64_t NLSStringAddQuotesS_MBCS_nonmodal_GB18030(
+    const NLSSMHandle *handle, const uint8_t *source, int64_t sourceLength, uint8_t *destination,
+    int64_t destinationLength, int64_t *resultLength);
 
 /* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
+/* Four copying edits: each reads a source and writes the result into a
+ * separate destination; results are statuses. Plain forms take descriptors
+ * and read from the current character; S forms take buffers with byte
+ * lengths and read the whole buffer. `written` (may be null) receives the
+ * bytes written. Members: _SBCS, _UTF8 (UTF-8 and UTF-EBCDIC), _WCS2, _WCS4,
+ * _DBCS (double-byte code pages, EUC-JP, EUC-TW, GB18030) and _DBCSM
+ * (shift-out/shift-in text).
+ *
+ * Characters are compared and copied whole: one byte, a UTF-8 or UTF-EBCDIC
+ * lead with its continuation bytes (a stray continuation byte or a
+ * sequence cut short is a character of its own), a two-byte unit or a
+ * surrogate pair, a four-byte unit (compared in memory order), or the
+ * class's double-byte, EUC or GB18030 character (a lead byte without its
+ * trail bytes is one byte). A trailing partial unit of wide text is ignored.
+ * In shift-out/shift-in text shift sequences only set the width of the
+ * characters after them: characters of different widths never compare
+ * equal, and the output gets a shift-out or shift-in wherever the width
+ * changes, keeps room for the closing shift-in while a double-byte run is
+ * open, and closes it at the end. A character that does not fit is never
+ * split.
+ *
+ * Destination (plain forms): writing starts at the destination's
+ * curOffset (an unset one counts as 0; in modal text inside a double-byte
+ * run when its charKind says so) and may use its capacity from there. After
+ * writing `count` bytes: an unset destination that got text has curOffset
+ * 0 and length count; otherwise length is the position plus count;
+ * nextOffset is the position plus one. When the destination's buffer
+ * overlaps the source text, the result is built in a work buffer of the
+ * destination's capacity (on the stack up to 2048 bytes, beyond that from
+ * the handle's pool, or, when the pool refuses, 2048 bytes on the stack with
+ * the room cut to 2048), copied to the start of the destination, which is
+ * then positioned at its first character. S forms apply the same overlap
+ * rule to the destination buffer.
+ *
+ * Null descriptors, buffers with text or lists: NLSSM_E_NULL_ARGUMENT. The
+ * trailing flags words are reserved; pass 0. */
+
+/* Transliterate: each source character found among the first pairCount
+ * characters of fromList is replaced by the toList character at the same
+ * index (the first match wins); others are copied. pairCount 0 or less: the
+ * shorter list's character count; a larger pairCount is cut to it. n: the
+ * characters of the source to process, 0 or less for all. Status
+ * NLSSM_E_DEST_TOO_SMALL when the characters do not all fit; what fits is
+ * written. */
+
+NLSSM_API int64_t NLSStringTransliterate_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                              int64_t n, const NLSString *toList,
+                                              const NLSString *fromList, int64_t pairCount,
+                                              NLSString *destination, int64_t *written,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringTransliterate_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                              int64_t n, const NLSString *toList,
+                                              const NLSString *fromList, int64_t pairCount,
+                                              NLSString *destination, int64_t *written,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringTransliterate_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                              int64_t n, const NLSString *toList,
+                                              const NLSString *fromList, int64_t pairCount,
+                                              NLSString *destination, int64_t *written,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringTransliterate_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                              int64_t n, const NLSString *toList,
+                                              const NLSString *fromList, int64_t pairCount,
+                                              NLSString *destination, int64_t *written,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringTransliterate_DBCS(const NLSSMHandle *handle, const NLSString *source,
+                                              int64_t n, const NLSString *toList,
+                                              const NLSString *fromList, int64_t pairCount,
+                                              NLSString *destination, int64_t *written,
+                                              int64_t flags);
+NLSSM_API int64_t NLSStringTransliterate_DBCSM(const NLSSMHandle *handle, const NLSString *source,
+                                               int64_t n, const NLSString *toList,
+                                               const NLSString *fromList, int64_t pairCount,
+                                               NLSString *destination, int64_t *written,
+                                               int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, const uint8_t *toList,
+                                               int64_t toLength, const uint8_t *fromList,
+                                               int64_t fromLength, int64_t pairCount,
+                                               uint8_t *destination, int64_t destinationLength,
+                                               int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, const uint8_t *toList,
+                                               int64_t toLength, const uint8_t *fromList,
+                                               int64_t fromLength, int64_t pairCount,
+                                               uint8_t *destination, int64_t destinationLength,
+                                               int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, const uint8_t *toList,
+                                               int64_t toLength, const uint8_t *fromList,
+                                               int64_t fromLength, int64_t pairCount,
+                                               uint8_t *destination, int64_t destinationLength,
+                                               int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, const uint8_t *toList,
+                                               int64_t toLength, const uint8_t *fromList,
+                                               int64_t fromLength, int64_t pairCount,
+                                               uint8_t *destination, int64_t destinationLength,
+                                               int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_DBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                               int64_t sourceLength, const uint8_t *toList,
+                                               int64_t toLength, const uint8_t *fromList,
+                                               int64_t fromLength, int64_t pairCount,
+                                               uint8_t *destination, int64_t destinationLength,
+                                               int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateS_DBCSM(const NLSSMHandle *handle, const uint8_t *source,
+                                                int64_t sourceLength, const uint8_t *toList,
+                                                int64_t toLength, const uint8_t *fromList,
+                                                int64_t fromLength, int64_t pairCount,
+                                                uint8_t *destination, int64_t destinationLength,
+                                                int64_t *written, int64_t flags);
+/* The lists as literals in the host's literal encoding (62), converted
+ * through the handle's charConverter, then the handle's NLSStringTransliterate
+ * (or NLSStringTransliterateS) operation. A failed conversion returns its
+ * status (NLSSM_E_NO_MEMORY when the buffer for it could not be had). */
+NLSSM_API int64_t NLSStringTransliterateLit(const NLSSMHandle *handle, const NLSString *source,
+                                            int64_t n, const uint8_t *toList, int64_t toLength,
+                                            const uint8_t *fromList, int64_t fromLength,
+                                            int64_t pairCount, NLSString *destination,
+                                            int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTransliterateLitS(const NLSSMHandle *handle, const uint8_t *source,
+                                             int64_t sourceLength, const uint8_t *toList,
+                                             int64_t toLength, const uint8_t *fromList,
+                                             int64_t fromLength, int64_t pairCount,
+                                             uint8_t *destination, int64_t destinationLength,
+                                             int64_t *written, int64_t flags);
+
+/* Tranword: every occurrence of the word `find` in the source is replaced by
+ * `replacement`; matches do not overlap and replaced text is not searched
+ * again. Each character copied counts n down by one, each replacement by
+ * findLength (not below 0); the copy stops when n reaches 0, at the end of
+ * the source, or when the room is used up. Plain form: n, replacementLength
+ * and findLength that are 0 (or less) are each taken as the source's
+ * character count (NLSNumChars); the words themselves are their descriptors'
+ * text from the current character, so with findLength 0 the first
+ * replacement uses up n and the rest of the source is not copied.
+ * replacementLength has no other effect. S form: n is the source's
+ * character count, the words are the given buffers, and each replacement
+ * counts n down by the find word's character count. An empty find word
+ * matches nothing; an empty replacement deletes the word. Status
+ * NLSSM_E_DEST_TOO_SMALL when the room ran out before n did, or a
+ * replacement did not fit (the source is then copied on as far as it fits).
+ * Words are matched character by character at character starts. */
+NLSSM_API int64_t NLSStringTranword_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *replacement,
+                                         int64_t replacementLength, const NLSString *find,
+                                         int64_t findLength, NLSString *destination,
+                                         int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranword_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *replacement,
+                                         int64_t replacementLength, const NLSString *find,
+                                         int64_t findLength, NLSString *destination,
+                                         int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranword_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *replacement,
+                                         int64_t replacementLength, const NLSString *find,
+                                         int64_t findLength, NLSString *destination,
+                                         int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranword_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *replacement,
+                                         int64_t replacementLength, const NLSString *find,
+                                         int64_t findLength, NLSString *destination,
+                                         int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranword_DBCS(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *replacement,
+                                         int64_t replacementLength, const NLSString *find,
+                                         int64_t findLength, NLSString *destination,
+                                         int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranword_DBCSM(const NLSSMHandle *handle, const NLSString *source,
+                                          int64_t n, const NLSString *replacement,
+                                          int64_t replacementLength, const NLSString *find,
+                                          int64_t findLength, NLSString *destination,
+                                          int64_t *written, int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *replacement,
+                                          int64_t replacementLength, const uint8_t *find,
+                                          int64_t findLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written,
+                                          int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *replacement,
+                                          int64_t replacementLength, const uint8_t *find,
+                                          int64_t findLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written,
+                                          int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *replacement,
+                                          int64_t replacementLength, const uint8_t *find,
+                                          int64_t findLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written,
+                                          int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *replacement,
+                                          int64_t replacementLength, const uint8_t *find,
+                                          int64_t findLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written,
+                                          int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_DBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *replacement,
+                                          int64_t replacementLength, const uint8_t *find,
+                                          int64_t findLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written,
+                                          int64_t flags);
+NLSSM_API int64_t NLSStringTranwordS_DBCSM(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceLength, const uint8_t *replacement,
+                                           int64_t replacementLength, const uint8_t *find,
+                                           int64_t findLength, uint8_t *destination,
+                                           int64_t destinationLength, int64_t *written,
+                                           int64_t flags);
+
+/* Squeeze: every run of the squeeze character among the first n characters
+ * of the source (0 or less: all) is reduced to one; other characters are
+ * copied. The squeeze character is the character at squeezeChar's current
+ * position (plain) or the first character of the squeezeChar buffer (S);
+ * when there is none, the source is copied unchanged. Status
+ * NLSSM_E_DEST_TOO_SMALL when the destination is full before the source is
+ * used up. */
+NLSSM_API int64_t NLSStringSqueeze_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                        int64_t n, const NLSString *squeezeChar,
+                                        NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueeze_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                        int64_t n, const NLSString *squeezeChar,
+                                        NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueeze_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                        int64_t n, const NLSString *squeezeChar,
+                                        NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueeze_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                        int64_t n, const NLSString *squeezeChar,
+                                        NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueeze_DBCS(const NLSSMHandle *handle, const NLSString *source,
+                                        int64_t n, const NLSString *squeezeChar,
+                                        NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueeze_DBCSM(const NLSSMHandle *handle, const NLSString *source,
+                                         int64_t n, const NLSString *squeezeChar,
+                                         NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                         int64_t sourceLength, const uint8_t *squeezeChar,
+                                         int64_t squeezeLength, uint8_t *destination,
+                                         int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                         int64_t sourceLength, const uint8_t *squeezeChar,
+                                         int64_t squeezeLength, uint8_t *destination,
+                                         int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                         int64_t sourceLength, const uint8_t *squeezeChar,
+                                         int64_t squeezeLength, uint8_t *destination,
+                                         int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                         int64_t sourceLength, const uint8_t *squeezeChar,
+                                         int64_t squeezeLength, uint8_t *destination,
+                                         int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_DBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                         int64_t sourceLength, const uint8_t *squeezeChar,
+                                         int64_t squeezeLength, uint8_t *destination,
+                                         int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringSqueezeS_DBCSM(const NLSSMHandle *handle, const uint8_t *source,
+                                          int64_t sourceLength, const uint8_t *squeezeChar,
+                                          int64_t squeezeLength, uint8_t *destination,
+                                          int64_t destinationLength, int64_t *written);
+/* Squeeze with the first character of a literal in the host's literal
+ * encoding (62), converted through the handle's charConverter, through the
+ * handle's NLSStringSqueeze (or NLSStringSqueezeS) operation. An empty
+ * literal (length 0 or less) squeezes the handle's blank character.
+ * `characters` (may be null) receives the characters written, counted
+ * through the handle's NLSNumCharsS, beside the bytes in `written`. The S
+ * form takes the arguments of the plain one with buffers and byte lengths
+ * for the source and destination and no n. NLSSM_E_NO_MEMORY when the
+ * buffer for the converted literal could not be had from the handle's pool;
+ * another failed conversion returns its status. */
+NLSSM_API int64_t NLSStringSqueezeLit(const NLSSMHandle *handle, const NLSString *source, int64_t n,
+                                      const uint8_t *literal, int64_t literalLength,
+                                      NLSString *destination, int64_t *written, int64_t *characters,
+                                      int64_t flags);
+NLSSM_API int64_t NLSStringSqueezeLitS(const NLSSMHandle *handle, const uint8_t *source,
+                                       int64_t sourceLength, const uint8_t *literal,
+                                       int64_t literalLength, uint8_t *destination,
+                                       int64_t destinationLength, int64_t *written,
+                                       int64_t *characters, int64_t flags);
+
+/* Remove delimiters: the source's first character is the delimiter and its
+ * last character the closing one, which is dropped; the characters between
+ * are copied, a doubled delimiter as one (the inverse of add-quotes). A
+ * full destination ends the copy with status 0. NLSSM_E_DEST_TOO_SMALL only
+ * when the source holds fewer than two characters (nothing is written). */
+NLSSM_API int64_t NLSStringRemoveDelimiters_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                                 NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimiters_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                                 NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimiters_WCS2(const NLSSMHandle *handle, const NLSString *source,
+                                                 NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimiters_WCS4(const NLSSMHandle *handle, const NLSString *source,
+                                                 NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimiters_DBCS(const NLSSMHandle *handle, const NLSString *source,
+                                                 NLSString *destination, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimiters_DBCSM(const NLSSMHandle *handle,
+                                                  const NLSString *source, NLSString *destination,
+                                                  int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                                  int64_t sourceLength, uint8_t *destination,
+                                                  int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                                  int64_t sourceLength, uint8_t *destination,
+                                                  int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                                  int64_t sourceLength, uint8_t *destination,
+                                                  int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                                  int64_t sourceLength, uint8_t *destination,
+                                                  int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_DBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                                  int64_t sourceLength, uint8_t *destination,
+                                                  int64_t destinationLength, int64_t *written);
+NLSSM_API int64_t NLSStringRemoveDelimitersS_DBCSM(const NLSSMHandle *handle, const uint8_t *source,
+                                                   int64_t sourceLength, uint8_t *destination,
+                                                   int64_t destinationLength, int64_t *written);
 
 /* ---- Number parsing and formatting ---------------------------------------- */
+/* Slots 29-32. Every member takes the handle, then a host locale object (null:
+ * the handle's own "en_US" locale). Texts and destinations are at most 152
+ * bytes: a longer text, or a capacity above 152 or below 0, gives
+ * NLSSM_E_NUMBER_TOO_LONG before anything is read; a null text, destination
+ * or out pointer gives NLSSM_E_NULL_ARGUMENT. Host statuses are returned
+ * unchanged.
+ *
+ * Parse integer: blanks, an optional '+' or '-', blanks, digits. Empty or
+ * all-blank text reads as 0 (status 0, all consumed); a sign without digits
+ * is NLSSM_E_NOT_A_NUMBER. After the digits a blank or NUL ends the number;
+ * any other character gives NLSSM_E_NOT_A_NUMBER with the value read so far
+ * (neither is consumed). With flag NLSSM_NUMBER_STRICT_TAIL only blanks,
+ * optionally ended by a NUL, may follow (the blanks are consumed). Overflow:
+ * NLSSM_E_INT_OVERFLOW, value 0, every digit consumed. `consumed` counts
+ * bytes: the 32-bit forms read bytes / 4 units of 4 bytes (the _swap2 form
+ * too, after reversing the bytes of each 16-bit unit; _swap4 reverses each
+ * 32-bit unit) and report units x 4; _toQVChar converts with the handle's
+ * ownFromConverter and reports characters x unitWidth. */
+#define NLSSM_NUMBER_STRICT_TAIL 0x1000u
+NLSSM_API int64_t NLSStringToIntmax_ASCII(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, uint32_t flags, int64_t *value,
+                                          int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_EBCDIC(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, uint32_t flags,
+                                           int64_t *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_QVChar(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, uint32_t flags,
+                                           int64_t *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_swap2(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, uint32_t flags, int64_t *value,
+                                          int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_swap4(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, uint32_t flags, int64_t *value,
+                                          int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_toQVChar(const NLSSMHandle *handle, void *locale,
+                                             const void *text, int64_t textBytes, uint32_t flags,
+                                             int64_t *value, int32_t *consumed);
+
+/* Parse double: the locale's parser reads the text (the UTF-8 entry for
+ * encoding 20, the ASCII entry for other ASCII-based encodings, the EBCDIC
+ * entry, or the 32-bit entry after the same unit handling as the integer
+ * parsers); options go to it unchanged (NLSHOST_PARSE_STRICT_TAIL). The fifth
+ * argument is ignored. On a non-zero status `consumed` is not written. */
+NLSSM_API int64_t NLSStringToDouble_ASCII(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, int64_t reserved, uint32_t options,
+                                          double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_EBCDIC(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, int64_t reserved,
+                                           uint32_t options, double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_QVChar(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, int64_t reserved,
+                                           uint32_t options, double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_swap2(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, int64_t reserved, uint32_t options,
+                                          double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_swap4(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, int64_t reserved, uint32_t options,
+                                          double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_toQVChar(const NLSSMHandle *handle, void *locale,
+                                             const void *text, int64_t textBytes, int64_t reserved,
+                                             uint32_t options, double *value, int32_t *consumed);
+
+/* Format integer. A width above the capacity fills the capacity with '*'
+ * (NLSSM_E_NUMBER_DOES_NOT_FIT). With flags (NLSHOST_NUMBER_*) and a value
+ * other than 0 the locale formats; otherwise the module writes the number
+ * right-aligned in `width` characters with blanks on the left, or the whole
+ * field in '*' with NLSSM_E_NUMBER_DOES_NOT_FIT when it does not fit. A width
+ * of 0 or less means the number's own width. The _ASCII and _EBCDIC forms
+ * write one byte per character (digits, blank, apostrophe, '*', '+', ',',
+ * '-', '.'; U+00A0 as the encoding's no-break-space substitute; EBCDIC
+ * writes the apostrophe as its substitute too; anything else '?' or 0x6F);
+ * the _MBCS forms copy a multi-byte substitute whole and, when it does not
+ * fit, fill the rest with '*' and give NLSSM_E_DEST_TOO_SMALL. The 32-bit
+ * forms write capacity / 4 characters as 4-byte units (_swap2 reversing the
+ * bytes of each 16-bit unit, _swap4 of each 32-bit unit) and report
+ * characters x 4; _fromQVChar converts with the handle's ownToConverter. */
+NLSSM_API int64_t NLSStringFromIntmax_ASCII_SBCS(const NLSSMHandle *handle, void *locale,
+                                                 int64_t value, int64_t width, uint32_t flags,
+                                                 void *destination, int64_t capacity,
+                                                 int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_EBCDIC_SBCS(const NLSSMHandle *handle, void *locale,
+                                                  int64_t value, int64_t width, uint32_t flags,
+                                                  void *destination, int64_t capacity,
+                                                  int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_ASCII_MBCS(const NLSSMHandle *handle, void *locale,
+                                                 int64_t value, int64_t width, uint32_t flags,
+                                                 void *destination, int64_t capacity,
+                                                 int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_EBCDIC_MBCS(const NLSSMHandle *handle, void *locale,
+                                                  int64_t value, int64_t width, uint32_t flags,
+                                                  void *destination, int64_t capacity,
+                                                  int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_QVChar(const NLSSMHandle *handle, void *locale, int64_t value,
+                                             int64_t width, uint32_t flags, void *destination,
+                                             int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_swap2(const NLSSMHandle *handle, void *locale, int64_t value,
+                                            int64_t width, uint32_t flags, void *destination,
+                                            int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_swap4(const NLSSMHandle *handle, void *locale, int64_t value,
+                                            int64_t width, uint32_t flags, void *destination,
+                                            int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_fromQVChar(const NLSSMHandle *handle, void *locale,
+                                                 int64_t value, int64_t width, uint32_t flags,
+                                                 void *destination, int64_t capacity,
+                                                 int32_t *written);
+
+/* Format double: always the locale's formatter (decimals 0-16, or
+ * NLSHOST_DECIMALS_SHORTEST), then written as the integer forms write; 'E'
+ * and 'e' are kept. The locale's status is returned even when output was
+ * written. _UTF8 has the locale write UTF-8 straight into the destination. */
+NLSSM_API int64_t NLSStringFromDouble_ASCII_SBCS(const NLSSMHandle *handle, void *locale,
+                                                 double value, int64_t width, int64_t decimals,
+                                                 uint32_t flags, void *destination,
+                                                 int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_EBCDIC_SBCS(const NLSSMHandle *handle, void *locale,
+                                                  double value, int64_t width, int64_t decimals,
+                                                  uint32_t flags, void *destination,
+                                                  int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_ASCII_MBCS(const NLSSMHandle *handle, void *locale,
+                                                 double value, int64_t width, int64_t decimals,
+                                                 uint32_t flags, void *destination,
+                                                 int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_EBCDIC_MBCS(const NLSSMHandle *handle, void *locale,
+                                                  double value, int64_t width, int64_t decimals,
+                                                  uint32_t flags, void *destination,
+                                                  int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_UTF8(const NLSSMHandle *handle, void *locale, double value,
+                                           int64_t width, int64_t decimals, uint32_t flags,
+                                           void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_QVChar(const NLSSMHandle *handle, void *locale, double value,
+                                             int64_t width, int64_t decimals, uint32_t flags,
+                                             void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_swap2(const NLSSMHandle *handle, void *locale, double value,
+                                            int64_t width, int64_t decimals, uint32_t flags,
+                                            void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_swap4(const NLSSMHandle *handle, void *locale, double value,
+                                            int64_t width, int64_t decimals, uint32_t flags,
+                                            void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_fromQVChar(const NLSSMHandle *handle, void *locale,
+                                                 double value, int64_t width, int64_t decimals,
+                                                 uint32_t flags, void *destination,
+                                                 int64_t capacity, int32_t *written);
 
 /* ---- Bidirectional text --------------------------------------------------- */
 

@@ -19,6 +19,7 @@ struct HotOps {
   int64_t (*mem_scan)(const uint8_t *buffer, int64_t length, uint8_t byte);
   int64_t (*mem_nscan)(const uint8_t *buffer, int64_t length, uint8_t byte);
   int64_t (*mem_tnscan)(const uint32_t *buffer, int64_t count, uint32_t value);
+  int64_t (*mem_mismatch)(const uint8_t *a, const uint8_t *b, int64_t length);
 };
 
 #define NLSSM_KERNEL_HOT_DECLS                                               \
@@ -29,6 +30,7 @@ struct HotOps {
   int64_t mem_scan(const uint8_t *buffer, int64_t length, uint8_t byte);     \
   int64_t mem_nscan(const uint8_t *buffer, int64_t length, uint8_t byte);    \
   int64_t mem_tnscan(const uint32_t *buffer, int64_t count, uint32_t value); \
+  int64_t mem_mismatch(const uint8_t *a, const uint8_t *b, int64_t length);  \
   extern const HotOps kHotOps;
 
 namespace sse2 {

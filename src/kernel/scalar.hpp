@@ -110,6 +110,14 @@ inline int64_t wmem_cmp(const uint32_t *a, const uint32_t *b, int64_t n) {
   return 0;
 }
 
+// Offset of the first byte at which the ranges differ, or n when they agree
+// (0 for an empty or negative range).
+inline int64_t mem_mismatch(const uint8_t *a, const uint8_t *b, int64_t n) {
+  int64_t i = 0;
+  while (i < n && a[i] == b[i]) ++i;
+  return i;
+}
+
 // Copies as if through an intermediate buffer, whatever the overlap.
 inline void *mem_move(const void *source, void *destination, int64_t n) {
   if (n <= 0 || source == nullptr || destination == nullptr) return destination;

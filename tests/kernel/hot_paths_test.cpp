@@ -25,7 +25,8 @@ std::vector<Path> paths() {
     if (kernel::cpu::supports(variant.isa))
       out.push_back({kernel::cpu::name(variant.isa), *variant.table});
   out.push_back(
-      {"exported", {skStrUp, skStrLow, skMemSet, skMemTSet, skMemScan, skMemNScan, skMemTNScan}});
+      {"exported", {skStrUp, skStrLow, skMemSet, skMemTSet, skMemScan, skMemNScan, skMemTNScan,
+                    kernel::scalar::mem_mismatch}});
   return out;
 }
 

@@ -1,0 +1,111 @@
+// What the editing operations share: the character rule of the multi-byte
+// non-modal members (chosen by encoding number), walks over whole
+// characters, the range a descriptor's operation covers, and blank fills.
+#pragma once
+
+#include <nlssm/nlssm.h>
+
+#include <algorithm>
+#include <cstdint>
+#include <cstring>
+
+#include "cursor/char_model.hpp"
+
+namespace nlssm::edit {
+
+inline constexpr int64_t kUnset = NLSSM_POS_NONE;
+
+// UTF-EBCDIC characters by the skip table; a trailing byte or an unused lead
+// stands alone.
+struct UtfeStepModel : cursor::StatelessModel {
+  explicit UtfeStepModel(const NLSSMHandle * = nullptr) {}
+  int64_t step(const uint8_t *p, int64_t, uint32_t) const {
+    const int64_t n = cursor::kSkipUtfe[*p];
+    return n == 0 ? 1 : n;
+  }
+};
+
+// Calls fn with the character model of a multi-byte non-modal handle: UTF-8
+// (encoding 20), UTF-EBCDIC (the rest of class 1), EUC-JP, EUC-TW, GB18030,
+// and the lead-byte flags of every other double-byte set.
+template <class Fn>
+decltype(auto) with_multibyte_model(const NLSSMHandle *h, Fn &&fn) {
+  switch (h->encodingNumber) {
+    case NLSSM_ENC_UTF8:
+      return fn(cursor::Utf8StepModel(h));
+    case NLSSM_ENC_EUC_JP:
+      return fn(cursor::EucJpModel(h));
+    case 119:
+    case 120:
+    case 159:
+      return fn(cursor::EucTwModel(h));
+    case NLSSM_ENC_GB18030:
+      return fn(cursor::Gb18030Model(h));
+    default:
+      if (h->encodingClass == NLSSM_CLASS_UTF8) return fn(UtfeStepModel(h));
+      return fn(cursor::DbcsModel(h));
+  }
+}
+
+// Big-endian two-byte text is encoding 24; big-endian four-byte text is 26.
+inline bool wide_big_endian(const NLSSMHandle *h) {
+  return h->encodingNumber == (h->encodingClass == NLSSM_CLASS_WCS4 ? 26u : NLSSM_ENC_WCS2_BE);
+}
+
+// Bytes of the character at p, never more than remain.
+template <class M>
+int64_t whole_char(const M &m, const uint8_t *p, int64_t remaining) {
+  return std::min(m.step(p, remaining, 0), remaining);
+}
+
+// Bytes taken by the first `limit` characters of p[0, length) (all of them
+// when limit is 0 or less); their count through `chars`.
+template <class M>
+int64_t span_of(const M &m, const uint8_t *p, int64_t length, int64_t limit, int64_t *chars) {
+  int64_t off = 0, count = 0;
+  while (off < length && (limit <= 0 || count < limit)) {
+    off += whole_char(m, p + off, length - off);
+    ++count;
+  }
+  if (chars != nullptr) *chars = count;
+  return off;
+}
+
+// The text a plain operation works on: from the current character to the
+// end; empty when the descriptor is unset or its offset lies outside.
+struct Remaining {
+  uint8_t *text;
+  int64_t bytes;
+};
+
+inline Remaining remaining_of(const NLSString *s) {
+  if (s == nullptr || s->buffer == nullptr || s->curOffset < 0) return {nullptr, 0};
+  const auto length = static_cast<int64_t>(s->length);
+  if (s->curOffset >= length) return {s->buffer + length, 0};
+  return {s->buffer + s->curOffset, length - s->curOffset};
+}
+
+inline int64_t blank_width(const NLSSMHandle *h) {
+  return h->blankWidth == 2 || h->blankWidth == 4 ? static_cast<int64_t>(h->blankWidth) : 1;
+}
+
+// Fills `bytes` bytes with the handle's blank, whole blanks first; a tail
+// shorter than a blank gets the blank's first bytes.
+inline void fill_blanks(const NLSSMHandle *h, uint8_t *p, int64_t bytes) {
+  const int64_t width = blank_width(h);
+  if (bytes <= 0) return;
+  if (width == 1) {
+    std::memset(p, h->blankChar[0], static_cast<size_t>(bytes));
+    return;
+  }
+  int64_t off = 0;
+  for (; off + width <= bytes; off += width)
+    std::memcpy(p + off, h->blankChar, static_cast<size_t>(width));
+  std::memcpy(p + off, h->blankChar, static_cast<size_t>(bytes - off));
+}
+
+inline void store(int64_t *where, int64_t value) {
+  if (where != nullptr) *where = value;
+}
+
+}  // namespace nlssm::edit
