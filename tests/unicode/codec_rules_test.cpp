@@ -232,14 +232,16 @@ TEST(ToUtf32Driver, BlockPathMatchesTheCharacterLoopOnAnyText) {
                                                     {0xE6, 0x97},
                                                     {0xE6, 'x', 'y'},
                                                     {0xFF}};
-  for (int round = 0; round < 4000; ++round) {
+  for (int round = 0; round < 6000; ++round) {
     std::vector<uint8_t> text;
     const size_t target = rng() % 200;
     const int faults = rng() % 4;  // 0: well-formed pieces only
     while (text.size() < target) {
       const size_t limit = faults == 0 ? 9 : pieces.size();
       const auto &piece = pieces[rng() % limit];
-      text.insert(text.end(), piece.begin(), piece.end());
+      // Runs of one piece give the blocks of a single shape.
+      const int repeat = rng() % 4 == 0 ? 1 + rng() % 24 : 1;
+      for (int r = 0; r < repeat; ++r) text.insert(text.end(), piece.begin(), piece.end());
     }
     const int64_t capacity = rng() % 3 == 0 ? int64_t(rng() % (4 * text.size() + 8)) : 4 * 256;
     for (NLSUTFEncoder enc : {COPY_UTF32, COPY_UTF32_SWAP}) {
