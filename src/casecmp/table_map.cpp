@@ -139,15 +139,19 @@ int64_t map_blocks_sse2(const MapPlan &plan, const uint8_t *src, uint8_t *dst, i
 }  // namespace detail
 
 MapIsa best_map_isa() {
-  static const MapIsa isa =
-      kernel::cpu::supports(kernel::cpu::Isa::avx2) ? MapIsa::kAvx2 : MapIsa::kSse2;
+  using kernel::cpu::Isa;
+  static const MapIsa isa = kernel::cpu::supports(Isa::avx512vbmi) ? MapIsa::kAvx512
+                            : kernel::cpu::supports(Isa::avx2)     ? MapIsa::kAvx2
+                                                                   : MapIsa::kSse2;
   return isa;
 }
 
 void map_bytes(MapIsa isa, const uint8_t *table, const uint8_t *src, uint8_t *dst, int64_t n) {
   if (n <= 0) return;
   int64_t done = 0;
-  if (isa != MapIsa::kScalar && n >= kVectorBytes) {
+  if (isa == MapIsa::kAvx512) {
+    done = detail::map_blocks_avx512(table, src, dst, n);
+  } else if (isa != MapIsa::kScalar && n >= kVectorBytes) {
     MapPlan own;
     const MapPlan *plan = catalogue_plan(table);
     if (plan == nullptr && n >= kOwnPlanBytes) {

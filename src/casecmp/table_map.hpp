@@ -7,9 +7,10 @@
 //   - rows: for each 16-byte row of the table that maps any byte elsewhere,
 //     a 16-entry shuffle table of the amounts (AVX2 only, where one byte
 //     shuffle looks up 32 bytes).
-// The plan takes whichever needs fewer steps. Plans of the catalogue's case
-// tables are made on first use and kept; any other table gets a plan made
-// for the call when the text is long enough to pay for it.
+// The plan takes whichever needs fewer steps. Processors with AVX-512 byte
+// permutes need no plan: they look the whole table up, 64 bytes at a time. Plans of the catalogue's
+// case tables are made on first use and kept; any other table gets a plan made for the call when
+// the text is long enough to pay for it.
 #pragma once
 
 #include <cstdint>
@@ -31,7 +32,7 @@ struct MapPlan {
 // Builds the plan of a 256-byte table.
 void make_plan(const uint8_t *table, MapPlan &plan);
 
-enum class MapIsa : uint8_t { kScalar, kSse2, kAvx2 };
+enum class MapIsa : uint8_t { kScalar, kSse2, kAvx2, kAvx512 };
 
 // The instruction set map_bytes uses on this processor.
 MapIsa best_map_isa();
@@ -52,6 +53,7 @@ namespace detail {
 // pieces only and answers 0 when the plan has none usable.
 int64_t map_blocks_sse2(const MapPlan &plan, const uint8_t *src, uint8_t *dst, int64_t n);
 int64_t map_blocks_avx2(const MapPlan &plan, const uint8_t *src, uint8_t *dst, int64_t n);
+int64_t map_blocks_avx512(const uint8_t *table, const uint8_t *src, uint8_t *dst, int64_t n);
 }  // namespace detail
 
 }  // namespace nlssm::casecmp

@@ -25,6 +25,7 @@ constexpr int64_t kLongText = 64 * 1024;
 std::vector<cm::MapIsa> vector_isas() {
   std::vector<cm::MapIsa> isas{cm::MapIsa::kSse2};
   if (kernel::cpu::supports(kernel::cpu::Isa::avx2)) isas.push_back(cm::MapIsa::kAvx2);
+  if (kernel::cpu::supports(kernel::cpu::Isa::avx512vbmi)) isas.push_back(cm::MapIsa::kAvx512);
   return isas;
 }
 
