@@ -265,7 +265,25 @@ namespace cm = nlssm::casecmp;
   (const NLSSMHandle *h, const uint8_t *src, int64_t sourceBytes, uint8_t *dst, int64_t capacity, \
    int64_t *written, uint32_t options)
 
+// The generic members: plain and S form of one member per line.
+#define NLSSM_NORMALIZE_GENERIC(suffix, eucJp)                                                   \
+  int64_t NLSStringNormalize##suffix NLSSM_NORMALIZE_PARAMS {                                    \
+    return cm::normalize_generic(h, src, dst, count, options, eucJp);                            \
+  }                                                                                              \
+  int64_t NLSStringNormalizeS##suffix NLSSM_NORMALIZE_S_PARAMS {                                 \
+    return cm::normalize_s_generic(h, src, sourceBytes, dst, capacity, written, options, eucJp); \
+  }
+
 extern "C" {
+
+NLSSM_NORMALIZE_GENERIC(_WCS2L, false)
+NLSSM_NORMALIZE_GENERIC(_WCS2B, false)
+NLSSM_NORMALIZE_GENERIC(_WCS4L, false)
+NLSSM_NORMALIZE_GENERIC(_WCS4B, false)
+NLSSM_NORMALIZE_GENERIC(_UTFE, false)
+NLSSM_NORMALIZE_GENERIC(_MBCS_nonmodal_EUC_JP, true)
+NLSSM_NORMALIZE_GENERIC(_MBCS_nonmodal_EUC_TW, false)
+NLSSM_NORMALIZE_GENERIC(_MBCS_nonmodal_GB18030, false)
 
 int64_t NLSStringNormalize_SBCS NLSSM_NORMALIZE_PARAMS {
   return cm::normalize_sbcs(h, src, dst, count, options);
@@ -275,30 +293,6 @@ int64_t NLSStringNormalize_MBCS_nonmodal NLSSM_NORMALIZE_PARAMS {
 }
 int64_t NLSStringNormalize_MBCS_modal NLSSM_NORMALIZE_PARAMS {
   return cm::normalize_modal(h, src, dst, count, options);
-}
-int64_t NLSStringNormalize_WCS2L NLSSM_NORMALIZE_PARAMS {
-  return cm::normalize_generic(h, src, dst, count, options, false);
-}
-int64_t NLSStringNormalize_WCS2B NLSSM_NORMALIZE_PARAMS {
-  return cm::normalize_generic(h, src, dst, count, options, false);
-}
-int64_t NLSStringNormalize_WCS4L NLSSM_NORMALIZE_PARAMS {
-  return cm::normalize_generic(h, src, dst, count, options, false);
-}
-int64_t NLSStringNormalize_WCS4B NLSSM_NORMALIZE_PARAMS {
-  return cm::normalize_generic(h, src, dst, count, options, false);
-}
-int64_t NLSStringNormalize_UTFE NLSSM_NORMALIZE_PARAMS {
-  return cm::normalize_generic(h, src, dst, count, options, false);
-}
-int64_t NLSStringNormalize_MBCS_nonmodal_EUC_JP NLSSM_NORMALIZE_PARAMS {
-  return cm::normalize_generic(h, src, dst, count, options, true);
-}
-int64_t NLSStringNormalize_MBCS_nonmodal_EUC_TW NLSSM_NORMALIZE_PARAMS {
-  return cm::normalize_generic(h, src, dst, count, options, false);
-}
-int64_t NLSStringNormalize_MBCS_nonmodal_GB18030 NLSSM_NORMALIZE_PARAMS {
-  return cm::normalize_generic(h, src, dst, count, options, false);
 }
 int64_t NLSStringNormalize_UTF8 NLSSM_NORMALIZE_PARAMS {
   (void)src;
@@ -314,30 +308,6 @@ int64_t NLSStringNormalizeS_MBCS_nonmodal NLSSM_NORMALIZE_S_PARAMS {
 int64_t NLSStringNormalizeS_MBCS_modal NLSSM_NORMALIZE_S_PARAMS {
   (void)written;
   return cm::normalize_s_modal(h, src, sourceBytes, dst, capacity, options);
-}
-int64_t NLSStringNormalizeS_WCS2L NLSSM_NORMALIZE_S_PARAMS {
-  return cm::normalize_s_generic(h, src, sourceBytes, dst, capacity, written, options, false);
-}
-int64_t NLSStringNormalizeS_WCS2B NLSSM_NORMALIZE_S_PARAMS {
-  return cm::normalize_s_generic(h, src, sourceBytes, dst, capacity, written, options, false);
-}
-int64_t NLSStringNormalizeS_WCS4L NLSSM_NORMALIZE_S_PARAMS {
-  return cm::normalize_s_generic(h, src, sourceBytes, dst, capacity, written, options, false);
-}
-int64_t NLSStringNormalizeS_WCS4B NLSSM_NORMALIZE_S_PARAMS {
-  return cm::normalize_s_generic(h, src, sourceBytes, dst, capacity, written, options, false);
-}
-int64_t NLSStringNormalizeS_UTFE NLSSM_NORMALIZE_S_PARAMS {
-  return cm::normalize_s_generic(h, src, sourceBytes, dst, capacity, written, options, false);
-}
-int64_t NLSStringNormalizeS_MBCS_nonmodal_EUC_JP NLSSM_NORMALIZE_S_PARAMS {
-  return cm::normalize_s_generic(h, src, sourceBytes, dst, capacity, written, options, true);
-}
-int64_t NLSStringNormalizeS_MBCS_nonmodal_EUC_TW NLSSM_NORMALIZE_S_PARAMS {
-  return cm::normalize_s_generic(h, src, sourceBytes, dst, capacity, written, options, false);
-}
-int64_t NLSStringNormalizeS_MBCS_nonmodal_GB18030 NLSSM_NORMALIZE_S_PARAMS {
-  return cm::normalize_s_generic(h, src, sourceBytes, dst, capacity, written, options, false);
 }
 int64_t NLSStringNormalizeS_UTF8 NLSSM_NORMALIZE_S_PARAMS {
   (void)src;
