@@ -1004,145 +1004,145 @@ NLSSM_API int64_t GetNumBytes(const NLSSMHandle *handle, const NLSString *string
  * that would run past the end leaves its character; NLSStringUpper_UTFE
  * ignores the count. */
 NLSSM_API int64_t NLSStringLower_SBCS(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_SBCS(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringLowerC_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLower_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLower_MBCS_modal(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                               int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, NLSString *string,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t count, uint32_t options);
 NLSSM_API int64_t NLSStringLower_WCS2L(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_WCS2L(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS2L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringLowerC_WCS2L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                        uint32_t options);
 NLSSM_API int64_t NLSStringLower_WCS2B(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_WCS2B(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS2B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringLowerC_WCS2B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                        uint32_t options);
 NLSSM_API int64_t NLSStringLower_WCS4L(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_WCS4L(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS4L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringLowerC_WCS4L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                        uint32_t options);
 NLSSM_API int64_t NLSStringLower_WCS4B(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_WCS4B(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS4B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringLowerC_WCS4B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                        uint32_t options);
 NLSSM_API int64_t NLSStringLower_UTF8(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_UTF8(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringLowerC_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                       uint32_t options);
 NLSSM_API int64_t NLSStringLower_UTFE(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringLowerS_UTFE(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_UTFE(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringUpper_SBCS(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_SBCS(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringUpperC_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpper_MBCS_modal(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                               int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, NLSString *string,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t count, uint32_t options);
 NLSSM_API int64_t NLSStringUpper_WCS2L(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_WCS2L(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS2L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringUpperC_WCS2L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                        uint32_t options);
 NLSSM_API int64_t NLSStringUpper_WCS2B(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_WCS2B(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS2B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringUpperC_WCS2B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                        uint32_t options);
 NLSSM_API int64_t NLSStringUpper_WCS4L(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_WCS4L(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS4L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringUpperC_WCS4L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                        uint32_t options);
 NLSSM_API int64_t NLSStringUpper_WCS4B(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_WCS4B(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS4B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringUpperC_WCS4B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                        uint32_t options);
 NLSSM_API int64_t NLSStringUpper_UTF8(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_UTF8(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
 NLSSM_API int64_t NLSStringUpperC_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
-    uint32_t options);
+                                       uint32_t options);
 NLSSM_API int64_t NLSStringUpper_UTFE(const NLSSMHandle *handle, NLSString *string, int64_t count,
-    uint32_t options);
-NLSSM_API int64_t NLSStringUpperS_UTFE(const NLSSMHandle *handle, uint8_t *buffer, int64_t byteLength,
-    uint32_t options);
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_UTFE(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
 
 /* NLSStringNormalize copies the source (from its current character, at most
  * `count` characters, 0 = all) into the destination at its current offset
@@ -1165,29 +1165,37 @@ NLSSM_API int64_t NLSStringUpperS_UTFE(const NLSSMHandle *handle, uint8_t *buffe
  * - _UTF8: checks the options and runs the handle's NLSStringUpper or
  *   NLSStringLower on the destination; the source is not read. */
 NLSSM_API int64_t NLSStringNormalize_SBCS(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
-NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
+                                          NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                   const NLSString *source, NLSString *destination,
+                                                   int64_t count, uint32_t options);
 NLSSM_API int64_t NLSStringNormalize_MBCS_modal(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
+                                                NLSString *destination, int64_t count,
+                                                uint32_t options);
 NLSSM_API int64_t NLSStringNormalize_WCS2L(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
+                                           NLSString *destination, int64_t count, uint32_t options);
 NLSSM_API int64_t NLSStringNormalize_WCS2B(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
+                                           NLSString *destination, int64_t count, uint32_t options);
 NLSSM_API int64_t NLSStringNormalize_WCS4L(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
+                                           NLSString *destination, int64_t count, uint32_t options);
 NLSSM_API int64_t NLSStringNormalize_WCS4B(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
+                                           NLSString *destination, int64_t count, uint32_t options);
 NLSSM_API int64_t NLSStringNormalize_UTFE(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
-NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
-NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
-NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
+                                          NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                          const NLSString *source,
+                                                          NLSString *destination, int64_t count,
+                                                          uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                          const NLSString *source,
+                                                          NLSString *destination, int64_t count,
+                                                          uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                           const NLSString *source,
+                                                           NLSString *destination, int64_t count,
+                                                           uint32_t options);
 NLSSM_API int64_t NLSStringNormalize_UTF8(const NLSSMHandle *handle, const NLSString *source,
-    NLSString *destination, int64_t count, uint32_t options);
+                                          NLSString *destination, int64_t count, uint32_t options);
 /* NLSStringNormalizeS maps n = min(sourceBytes, capacity) bytes of the source
  * into the destination (they must not overlap unless equal) and stores n
  * through `written` (may be null); NLSSM_E_DEST_TOO_SMALL when the capacity is
@@ -1200,29 +1208,49 @@ NLSSM_API int64_t NLSStringNormalize_UTF8(const NLSSMHandle *handle, const NLSSt
  * length (kept within the capacity), without copying, and stores the source
  * length. */
 NLSSM_API int64_t NLSStringNormalizeS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
-NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
+                                           int64_t sourceBytes, uint8_t *destination,
+                                           int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                    const uint8_t *source, int64_t sourceBytes,
+                                                    uint8_t *destination, int64_t capacity,
+                                                    int64_t *written, uint32_t options);
 NLSSM_API int64_t NLSStringNormalizeS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
+                                                 int64_t sourceBytes, uint8_t *destination,
+                                                 int64_t capacity, int64_t *written,
+                                                 uint32_t options);
 NLSSM_API int64_t NLSStringNormalizeS_WCS2L(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
 NLSSM_API int64_t NLSStringNormalizeS_WCS2B(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
 NLSSM_API int64_t NLSStringNormalizeS_WCS4L(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
 NLSSM_API int64_t NLSStringNormalizeS_WCS4B(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
 NLSSM_API int64_t NLSStringNormalizeS_UTFE(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
-NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
-NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
-NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
+                                           int64_t sourceBytes, uint8_t *destination,
+                                           int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                           const uint8_t *source,
+                                                           int64_t sourceBytes,
+                                                           uint8_t *destination, int64_t capacity,
+                                                           int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                           const uint8_t *source,
+                                                           int64_t sourceBytes,
+                                                           uint8_t *destination, int64_t capacity,
+                                                           int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                            const uint8_t *source,
+                                                            int64_t sourceBytes,
+                                                            uint8_t *destination, int64_t capacity,
+                                                            int64_t *written, uint32_t options);
 NLSSM_API int64_t NLSStringNormalizeS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
-    int64_t sourceBytes, uint8_t *destination, int64_t capacity, int64_t *written, uint32_t options);
+                                           int64_t sourceBytes, uint8_t *destination,
+                                           int64_t capacity, int64_t *written, uint32_t options);
 
 
 /* ---- Equality, inequality and ordering comparison ------------------------- */
