@@ -171,6 +171,7 @@ enum class Utf8Form : uint8_t { kSpan, kChars };
 // character and blanks nothing.
 void walk_utf8(const NLSSMHandle *h, Case c, uint8_t *p, int64_t n, int64_t limit, Utf8Form form) {
   const uint8_t *ascii = (c == Case::kUpper ? kAsciiUpper : kAsciiLower).data();
+  HostCase host_case(h, c);
   int64_t r = 0, w = 0;
   for (int64_t chars = 0; r < n && chars < limit; ++chars) {
     const uint8_t b = p[r];
@@ -187,7 +188,7 @@ void walk_utf8(const NLSSMHandle *h, Case c, uint8_t *p, int64_t n, int64_t limi
     if (announced == 0 || announced > available ||
         UTF8_UTF32(p + r, available, &cp, &consumed) != NLSSM_OK)
       break;
-    const uint32_t to = host_case(h, cp, c);
+    const uint32_t to = host_case(cp);
     const int64_t size = to != 0 ? utf8_length(to) : consumed;
     if (size > n - w) break;
     if (to != 0) {
@@ -209,6 +210,7 @@ void walk_utf8(const NLSSMHandle *h, Case c, uint8_t *p, int64_t n, int64_t limi
 // character, or a character cut by the end of the text, ends the walk; a
 // mapping that would run past the end leaves its character as it is.
 void walk_utfe(const NLSSMHandle *h, Case c, uint8_t *p, int64_t n, int64_t limit) {
+  HostCase host_case(h, c);
   int64_t off = 0;
   for (int64_t chars = 0; off < n && chars < limit; ++chars) {
     const int64_t announced = cursor::kSkipUtfe[p[off]];
@@ -216,7 +218,7 @@ void walk_utfe(const NLSSMHandle *h, Case c, uint8_t *p, int64_t n, int64_t limi
     if (announced == 0 || announced > n - off) break;
     int64_t step = FromUTFE(h, p + off, &cp);
     if (step == 0) break;
-    const uint32_t to = host_case(h, cp, c);
+    const uint32_t to = host_case(cp);
     if (to != 0 && unicode::utfe_length(to) <= n - off) step = ToUTFE(h, to, p + off);
     off += step;
   }

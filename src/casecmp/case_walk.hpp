@@ -41,15 +41,40 @@ inline const uint8_t *case_table(const NLSSMHandle *h, Case c) {
   return c == Case::kUpper ? h->upperTable : h->lowerTable;
 }
 
-// The host's simple case mapping of a code point, 0 when it has none or the
-// query fails.
-inline uint32_t host_case(const NLSSMHandle *h, uint32_t codePoint, Case c) {
-  if (h->owner == nullptr) return 0;
-  const auto query = host::slot<NLSHostCharInfoFn>(h->owner, NLSHOST_SLOT_NLS_CHAR_INFO);
-  NLSHostCharInfo info{};
-  if (query == nullptr || query(h->owner, codePoint, &info) != NLSHOST_OK) return 0;
-  return c == Case::kUpper ? info.upper : info.lower;
-}
+// The host's simple case mapping of code points, 0 when it has none or the
+// query fails. Answers are kept for the rest of the walk in a small
+// direct-mapped cache: text repeats its characters, and the host's query
+// costs far more than the lookup.
+class HostCase {
+ public:
+  HostCase(const NLSSMHandle *h, Case c) : h_(h), upper_(c == Case::kUpper) {
+    if (h->owner != nullptr)
+      query_ = host::slot<NLSHostCharInfoFn>(h->owner, NLSHOST_SLOT_NLS_CHAR_INFO);
+    std::fill(std::begin(key_), std::end(key_), kEmpty);
+  }
+  uint32_t operator()(uint32_t codePoint) {
+    const uint32_t at = (codePoint ^ codePoint >> 7) % kSlots;
+    if (key_[at] != codePoint) {
+      key_[at] = codePoint;
+      value_[at] = ask(codePoint);
+    }
+    return value_[at];
+  }
+
+ private:
+  static constexpr uint32_t kSlots = 64;
+  static constexpr uint32_t kEmpty = 0xFFFFFFFFu;  // never asked: above every code point
+  uint32_t ask(uint32_t codePoint) const {
+    NLSHostCharInfo info{};
+    if (query_ == nullptr || query_(h_->owner, codePoint, &info) != NLSHOST_OK) return 0;
+    return upper_ ? info.upper : info.lower;
+  }
+  const NLSSMHandle *h_;
+  bool upper_;
+  NLSHostCharInfoFn query_ = nullptr;
+  uint32_t key_[kSlots];
+  uint32_t value_[kSlots] = {};
+};
 
 // What the table walks need of the handle: the single-byte table, and the
 // double-byte records when option bit 4 asks for them.
@@ -200,6 +225,7 @@ Walked walk_modal(const ByteTables &t, const cursor::ModalModel &m, const uint8_
 template <bool kBig>
 void walk_wcs2(const NLSSMHandle *h, Case c, uint8_t *p, int64_t n, int64_t limit) {
   using M = cursor::Wcs2Model<kBig>;
+  HostCase host_case(h, c);
   int64_t off = 0;
   for (int64_t chars = 0; n - off >= 2 && chars < limit; ++chars) {
     const uint16_t u = M::unit_at(p + off);
@@ -207,7 +233,7 @@ void walk_wcs2(const NLSSMHandle *h, Case c, uint8_t *p, int64_t n, int64_t limi
       off += 4;
       continue;
     }
-    const uint32_t to = host_case(h, u, c);
+    const uint32_t to = host_case(u);
     if (to != 0) {
       p[off + (kBig ? 0 : 1)] = static_cast<uint8_t>(to >> 8);
       p[off + (kBig ? 1 : 0)] = static_cast<uint8_t>(to);
@@ -219,12 +245,13 @@ void walk_wcs2(const NLSSMHandle *h, Case c, uint8_t *p, int64_t n, int64_t limi
 // `units` 32-bit units in place, each one a character.
 template <bool kBig>
 void walk_wcs4(const NLSSMHandle *h, Case c, uint8_t *p, int64_t units) {
+  HostCase host_case(h, c);
   for (int64_t i = 0; i < units; ++i) {
     uint8_t *q = p + 4 * i;
     const uint32_t u =
         kBig ? uint32_t{q[0]} << 24 | uint32_t{q[1]} << 16 | uint32_t{q[2]} << 8 | q[3]
              : uint32_t{q[3]} << 24 | uint32_t{q[2]} << 16 | uint32_t{q[1]} << 8 | q[0];
-    const uint32_t to = host_case(h, u, c);
+    const uint32_t to = host_case(u);
     if (to == 0) continue;
     for (int k = 0; k < 4; ++k) q[kBig ? 3 - k : k] = static_cast<uint8_t>(to >> (8 * k));
   }
