@@ -5,10 +5,13 @@
 // them).
 #include <nlssm/nlssm.h>
 
+#include <emmintrin.h>
+
 #include <type_traits>
 
 #include "casecmp/case_walk.hpp"
 #include "casecmp/table_map.hpp"
+#include "kernel/hot.hpp"
 #include "unicode/tables.hpp"
 
 namespace nlssm::casecmp {
@@ -149,12 +152,21 @@ int64_t wcs4_chars(const NLSSMHandle *h, uint8_t *p, int64_t count, uint32_t, Ca
 
 // ---- UTF-8 -------------------------------------------------------------------
 
-// The ASCII range of UTF-8 text goes through these tables; everything above
-// it through the host.
-constexpr std::array<uint8_t, 256> kAsciiLower =
-    cursor::detail::by_byte([](unsigned b) { return b >= 'A' && b <= 'Z' ? b + 32 : b; });
-constexpr std::array<uint8_t, 256> kAsciiUpper =
-    cursor::detail::by_byte([](unsigned b) { return b >= 'a' && b <= 'z' ? b - 32 : b; });
+// The ASCII range of UTF-8 text changes only at A-Z (lower) and a-z (upper):
+// whole runs of it go through the kernel's vector case flip. Everything
+// above it goes through the host.
+
+// Bytes below 0x80 from p on, at most n.
+int64_t ascii_run(const uint8_t *p, int64_t n) {
+  int64_t i = 0;
+  for (; i + 16 <= n; i += 16) {
+    const auto mask = static_cast<unsigned>(
+        _mm_movemask_epi8(_mm_loadu_si128(reinterpret_cast<const __m128i *>(p + i))));
+    if (mask != 0) return i + __builtin_ctz(mask);
+  }
+  while (i < n && p[i] < 0x80) ++i;
+  return i;
+}
 
 constexpr int64_t utf8_length(uint32_t c) {
   return c < 0x80 ? 1 : c < 0x800 ? 2 : c < 0x10000 ? 3 : 4;
@@ -170,15 +182,18 @@ enum class Utf8Form : uint8_t { kSpan, kChars };
 // the text keeps its length; the C form decodes at most 4 bytes per
 // character and blanks nothing.
 void walk_utf8(const NLSSMHandle *h, Case c, uint8_t *p, int64_t n, int64_t limit, Utf8Form form) {
-  const uint8_t *ascii = (c == Case::kUpper ? kAsciiUpper : kAsciiLower).data();
   HostCase host_case(h, c);
   int64_t r = 0, w = 0;
   for (int64_t chars = 0; r < n && chars < limit; ++chars) {
     const uint8_t b = p[r];
-    if (b < 0x80) {
-      if (w >= n) break;
-      p[w++] = ascii[b];
-      ++r;
+    if (b < 0x80) {  // a run of ASCII characters at once
+      const int64_t run = ascii_run(p + r, std::min(n - std::max(r, w), limit - chars));
+      if (run == 0) break;  // no room left at the write position
+      if (w != r) std::memmove(p + w, p + r, static_cast<size_t>(run));
+      (c == Case::kUpper ? kernel::hot().str_up : kernel::hot().str_low)(p + w, run);
+      w += run;
+      r += run;
+      chars += run - 1;
       continue;
     }
     const int64_t available = form == Utf8Form::kChars ? 4 : n - r;
