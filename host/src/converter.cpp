@@ -8,6 +8,7 @@
 #include <cstring>
 
 #include "internal.hpp"
+#include "table_pages.hpp"
 #include "utf_ebcdic.hpp"
 
 namespace nlssm::refhost {
@@ -39,10 +40,16 @@ std::uint32_t status_of(UErrorCode error) {
 }  // namespace
 
 struct Transcoder::Side {
-  UConverter *icu = nullptr;  // null: UTF-EBCDIC
+  UConverter *icu = nullptr;          // null: UTF-EBCDIC or a compiled page
+  const TableCodec *table = nullptr;  // a compiled single-byte page
 
   explicit Side(const EncodingInfo &info, bool &ok) {
     if (info.converter == "builtin:utf-ebcdic") return;
+    if (info.converter.rfind(kTablePrefix, 0) == 0) {
+      table = TableCodec::find(info.converter);
+      if (table == nullptr) ok = false;
+      return;
+    }
     UErrorCode error = U_ZERO_ERROR;
     icu = ucnv_open(info.converter.c_str(), &error);
     if (U_FAILURE(error)) {
@@ -59,6 +66,10 @@ struct Transcoder::Side {
 
   std::uint32_t decode(const std::uint8_t *source, std::size_t length, std::u16string &out) {
     out.clear();
+    if (table != nullptr) {
+      table->decode(source, length, out);
+      return 0;
+    }
     if (icu == nullptr) return decode_utfe(source, length, out);
     ucnv_resetToUnicode(icu);
     out.resize(2 * length + 8);  // no byte yields more than two UTF-16 units
@@ -75,6 +86,7 @@ struct Transcoder::Side {
                        std::vector<std::int32_t> &offsets) {
     out.clear();
     offsets.clear();
+    if (table != nullptr) return table->encode(text, out, offsets) ? 0 : NLSHOST_E_ILL_FORMED;
     if (icu == nullptr) return encode_utfe(text, out, offsets);
     ucnv_resetFromUnicode(icu);
     // Each unit gives at most the longest character plus a shift sequence.

@@ -1,15 +1,22 @@
-// Locale objects: number parsing and formatting with ICU's number formats for
-// the locale, over bytes (UTF-8, ASCII-based, EBCDIC-based) and 32-bit
-// characters.
+// Locale objects: number parsing and formatting over bytes (UTF-8,
+// ASCII-based, EBCDIC-based) and 32-bit characters. Doubles go through
+// std::from_chars (correctly rounded) and std::to_chars (shortest text that
+// reads back, or fixed decimals), with the separators of the locale's ICU
+// number format; integers through the ICU format itself.
 #include <unicode/uloc.h>
 #include <unicode/unum.h>
 #include <unicode/utf16.h>
 #include <unicode/utf8.h>
 
+#include <algorithm>
+#include <charconv>
 #include <cmath>
 #include <cstring>
+#include <iterator>
+#include <limits>
 #include <memory>
 #include <string>
+#include <string_view>
 
 #include "internal.hpp"
 
@@ -28,14 +35,12 @@ struct LocaleObject {
   ObjectCounters *counters = nullptr;
   std::mutex mutex;  // number formats are reconfigured per call
   UNumberFormat *decimal = nullptr;
-  UNumberFormat *scientific = nullptr;
   std::u16string decimalSeparator;
   std::u16string groupingSeparator;
   std::u16string plusSign;
 
   ~LocaleObject() {
     if (decimal != nullptr) unum_close(decimal);
-    if (scientific != nullptr) unum_close(scientific);
   }
 };
 
@@ -66,6 +71,73 @@ struct Units {
   }
 };
 
+// The number at the start of a text, rewritten in the notation std::from_chars
+// reads ('.' for the locale's decimal separator, grouping separators between
+// digits dropped), with the text position of every character kept so that
+// what from_chars consumes maps back to the text.
+struct Scanned {
+  std::string ascii;
+  std::vector<std::size_t> positions;  // one more entry: where the scan stopped
+
+  // Parses correctly rounded; a value beyond the double range becomes a
+  // signed infinity or zero. The text position after the number, or the
+  // starting position when there is no number.
+  std::size_t read(double &value) const {
+    const char *first = ascii.data();
+    const char *last = first + ascii.size();
+    const char *digits = first + (ascii.starts_with('-') ? 1 : 0);
+    // from_chars takes a sign of its own: a second one is no number.
+    if (digits == last || *digits == '-' || *digits == '+') return positions.front();
+    auto [end, error] = std::from_chars(first, last, value, std::chars_format::general);
+    if (error == std::errc::invalid_argument) return positions.front();
+    if (error == std::errc::result_out_of_range) {
+      const std::size_t mark = ascii.find_first_of("eE");
+      const bool tiny =
+          mark != std::string::npos && mark + 1 < ascii.size() && ascii[mark + 1] == '-';
+      value = tiny ? 0.0 : std::numeric_limits<double>::infinity();
+      if (digits != first) value = -value;
+    }
+    return positions[static_cast<std::size_t>(end - first)];
+  }
+};
+
+Scanned scan_number(const LocaleObject *locale, const std::u16string &text, std::size_t at,
+                    bool signAllowed) {
+  Scanned out;
+  auto take = [&](char c, std::size_t position) {
+    out.ascii.push_back(c);
+    out.positions.push_back(position);
+  };
+  const std::u16string &point = locale->decimalSeparator;
+  const std::u16string &group = locale->groupingSeparator;
+  auto is_digit = [&](std::size_t i) {
+    return i < text.size() && text[i] >= u'0' && text[i] <= u'9';
+  };
+  if (signAllowed && at < text.size() && text[at] == u'-') take('-', at++);
+  bool fraction = false;
+  while (at < text.size()) {
+    const char16_t unit = text[at];
+    const bool letter = (unit >= u'a' && unit <= u'z') || (unit >= u'A' && unit <= u'Z');
+    if (is_digit(at) || letter ||
+        ((unit == u'+' || unit == u'-') && !out.ascii.empty() &&
+         (out.ascii.back() == 'E' || out.ascii.back() == 'e'))) {
+      take(static_cast<char>(unit), at++);
+    } else if (!fraction && !point.empty() && text.compare(at, point.size(), point) == 0) {
+      take('.', at);
+      at += point.size();
+      fraction = true;
+    } else if (!fraction && !group.empty() && !out.ascii.empty() && out.ascii.back() >= '0' &&
+               out.ascii.back() <= '9' && text.compare(at, group.size(), group) == 0 &&
+               is_digit(at + group.size())) {
+      at += group.size();  // grouping between digits of the whole part
+    } else {
+      break;
+    }
+  }
+  out.positions.push_back(at);
+  return out;
+}
+
 std::int64_t parse_units(LocaleObject *locale, Units &units, std::int32_t sourceLength,
                          std::uint32_t options, double *value, std::int32_t *consumed) {
   if (value == nullptr || consumed == nullptr) return NLSHOST_E_NULL;
@@ -88,25 +160,19 @@ std::int64_t parse_units(LocaleObject *locale, Units &units, std::int32_t source
     *consumed = units.offsets[length];
     return 0;
   }
-  std::lock_guard lock(locale->mutex);
-  unum_setAttribute(locale->decimal, UNUM_GROUPING_USED, 1);
-  // ICU's parser takes a minus sign but no plus sign: step over a plus here.
+  // A plus sign is stepped over; a minus sign is kept for the number itself.
   std::size_t start = at;
   const std::u16string &plus = locale->plusSign;
   if (!plus.empty() && units.text.compare(at, plus.size(), plus) == 0) start += plus.size();
-  auto position = static_cast<int32_t>(start);
-  UErrorCode error = U_ZERO_ERROR;
-  const double parsed =
-      start < length && (start == at || units.text[start] != u'-')
-          ? unum_parseDouble(locale->decimal, reinterpret_cast<const UChar *>(units.text.data()),
-                             static_cast<int32_t>(length), &position, &error)
-          : (error = U_PARSE_ERROR, 0.0);
-  if (U_FAILURE(error) || static_cast<std::size_t>(position) == start) {
+  const Scanned scanned = scan_number(locale, units.text, start, start == at);
+  double parsed = 0.0;
+  const std::size_t position = scanned.read(parsed);
+  if (position == start) {
     *consumed = units.offsets[at];
     return NLSHOST_E_NOT_A_NUMBER;
   }
   *value = parsed;
-  const auto stop = static_cast<std::size_t>(position);
+  const std::size_t stop = position;
   std::size_t tail = stop;
   while (tail < length && units.text[tail] == kBlank) ++tail;
   if ((options & NLSHOST_PARSE_STRICT_TAIL) && tail != length) {
@@ -264,38 +330,109 @@ struct Number {
   std::int64_t whole;
 };
 
+// A double in the locale's notation, from std::to_chars output: '.' becomes
+// the decimal separator, the whole part is grouped on request, and the
+// exponent is written E<n> (E-<n> below one) without leading zeros.
+std::u16string localized(const LocaleObject *locale, std::string_view ascii, std::uint32_t flags) {
+  std::u16string out;
+  std::size_t at = 0;
+  if (ascii.starts_with('-')) {
+    out.push_back(u'-');
+    at = 1;
+  }
+  const std::size_t mark = ascii.find('e');
+  const std::string_view mantissa =
+      ascii.substr(at, mark == std::string_view::npos ? std::string_view::npos : mark - at);
+  const std::size_t point = std::min(mantissa.find('.'), mantissa.size());
+  const bool numeric = !mantissa.empty() && mantissa[0] >= '0' && mantissa[0] <= '9';
+  for (std::size_t i = 0; i < mantissa.size(); ++i) {
+    if (i == point) {
+      out += locale->decimalSeparator;
+      continue;
+    }
+    out.push_back(static_cast<char16_t>(mantissa[i]));
+    const std::size_t left = point - i - 1;  // whole-part digits still to come
+    if (numeric && (flags & NLSHOST_NUMBER_GROUPING) && i < point && left > 0 && left % 3 == 0)
+      out += locale->groupingSeparator;
+  }
+  if (mark != std::string_view::npos) {
+    out.push_back(u'E');
+    std::size_t e = mark + 1;
+    if (ascii[e] == '-') out.push_back(u'-');
+    if (ascii[e] == '-' || ascii[e] == '+') ++e;
+    while (e + 1 < ascii.size() && ascii[e] == '0') ++e;
+    for (; e < ascii.size(); ++e) out.push_back(static_cast<char16_t>(ascii[e]));
+  }
+  return out;
+}
+
+std::u16string to_text(const LocaleObject *locale, double value, std::uint32_t flags,
+                       std::chars_format format, int precision) {
+  char buffer[400];  // the longest fixed text of a double with 16 decimals
+  // Shortest form: fixed or scientific, whichever is shorter, unless
+  // scientific is asked for.
+  const std::to_chars_result result =
+      precision >= 0 ? std::to_chars(buffer, std::end(buffer), value, format, precision)
+      : format == std::chars_format::scientific
+          ? std::to_chars(buffer, std::end(buffer), value, format)
+          : std::to_chars(buffer, std::end(buffer), value);
+  return localized(locale, std::string_view(buffer, result.ptr), flags);
+}
+
+// A double as text: `decimals` digits after the separator (correctly rounded
+// from the binary value), or with NLSHOST_DECIMALS_SHORTEST the shortest text
+// that reads back as the same double. When that is wider than a non-zero
+// width, fewer decimals, then fewer significant digits in scientific form,
+// are tried before the number is given up as too wide.
+std::u16string double_text(const LocaleObject *locale, double value, std::int64_t width,
+                           std::int64_t decimals, std::uint32_t flags, std::int64_t signWidth) {
+  const auto format = (flags & NLSHOST_NUMBER_SCIENTIFIC) ? std::chars_format::scientific
+                                                          : std::chars_format::fixed;
+  if (decimals != NLSHOST_DECIMALS_SHORTEST)
+    return to_text(locale, value, flags, format, static_cast<int>(decimals));
+  std::u16string text = to_text(locale, value, flags, format, -1);
+  auto fits = [&](const std::u16string &t) { return std::ssize(t) + signWidth <= width; };
+  if (width == 0 || fits(text) || !std::isfinite(value)) return text;
+  if (!(flags & NLSHOST_NUMBER_SCIENTIFIC)) {
+    for (int places = 16; places >= 0; --places) {
+      std::u16string shorter = to_text(locale, value, flags, std::chars_format::fixed, places);
+      if (fits(shorter)) return shorter;
+    }
+  }
+  for (int places = 16; places >= 0; --places) {
+    std::u16string shorter = to_text(locale, value, flags, std::chars_format::scientific, places);
+    if (fits(shorter)) return shorter;
+  }
+  return text;
+}
+
 // The field as code points: the number in the locale's notation, padded to
 // `width`, or '*' when it does not fit.
 std::int64_t format_field(LocaleObject *locale, const Number &number, std::int64_t width,
                           std::int64_t decimals, std::uint32_t flags, std::u32string &field) {
-  if ((flags & ~kFormatFlags) || width < 0 || decimals < 0 || decimals > kMaxDecimals)
+  const bool shortest = decimals == NLSHOST_DECIMALS_SHORTEST && !number.integer;
+  if ((flags & ~kFormatFlags) || width < 0 ||
+      (!shortest && (decimals < 0 || decimals > kMaxDecimals)))
     return NLSHOST_E_BAD_OPTIONS;
+  const bool plus =
+      (flags & NLSHOST_NUMBER_SIGN) && !std::signbit(number.real) && !std::isnan(number.real);
   std::u16string text;
-  {
+  if (!number.integer) {
+    text = double_text(locale, number.real, width, decimals, flags,
+                       plus ? std::ssize(locale->plusSign) : 0);
+  } else {
     std::lock_guard lock(locale->mutex);
-    UNumberFormat *format = (flags & NLSHOST_NUMBER_SCIENTIFIC) && !number.integer
-                                ? locale->scientific
-                                : locale->decimal;
+    UNumberFormat *format = locale->decimal;
     unum_setAttribute(format, UNUM_GROUPING_USED, (flags & NLSHOST_NUMBER_GROUPING) ? 1 : 0);
     unum_setAttribute(format, UNUM_MIN_FRACTION_DIGITS, static_cast<int32_t>(decimals));
     unum_setAttribute(format, UNUM_MAX_FRACTION_DIGITS, static_cast<int32_t>(decimals));
-    unum_setAttribute(format, UNUM_ROUNDING_MODE, UNUM_ROUND_HALFUP);
-    if (format == locale->scientific) {
-      // One digit before the decimal separator: d.dddE±n.
-      unum_setAttribute(format, UNUM_MIN_INTEGER_DIGITS, 1);
-      unum_setAttribute(format, UNUM_MAX_INTEGER_DIGITS, 1);
-    }
     UChar buffer[128];
     UErrorCode error = U_ZERO_ERROR;
-    const int32_t n = number.integer
-                          ? unum_formatInt64(format, number.whole, buffer, 128, nullptr, &error)
-                          : unum_formatDouble(format, number.real, buffer, 128, nullptr, &error);
+    const int32_t n = unum_formatInt64(format, number.whole, buffer, 128, nullptr, &error);
     if (U_FAILURE(error)) return NLSHOST_E_NUMBER_FIELD;
     text.assign(reinterpret_cast<char16_t *>(buffer), static_cast<std::size_t>(n));
   }
-  const bool negative = number.integer ? number.whole < 0 : std::signbit(number.real);
-  if ((flags & NLSHOST_NUMBER_SIGN) && !negative && !(number.real != number.real))
-    text = locale->plusSign + text;
+  if (plus) text = locale->plusSign + text;
   std::u32string digits;
   for (std::size_t i = 0; i < text.size();) {
     UChar32 c;
@@ -396,9 +533,6 @@ void *new_locale_object(const std::string &name, ObjectCounters &counters) {
   auto locale = std::make_unique<LocaleObject>();
   error = U_ZERO_ERROR;
   locale->decimal = unum_open(UNUM_DECIMAL, nullptr, 0, name.c_str(), nullptr, &error);
-  if (U_FAILURE(error)) return nullptr;
-  error = U_ZERO_ERROR;
-  locale->scientific = unum_open(UNUM_SCIENTIFIC, nullptr, 0, name.c_str(), nullptr, &error);
   if (U_FAILURE(error)) return nullptr;
   locale->decimalSeparator = symbol(locale->decimal, UNUM_DECIMAL_SEPARATOR_SYMBOL);
   locale->groupingSeparator = symbol(locale->decimal, UNUM_GROUPING_SEPARATOR_SYMBOL);

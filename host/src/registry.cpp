@@ -9,6 +9,7 @@
 #include <string>
 
 #include "nlssm/reference_host.hpp"
+#include "table_pages.hpp"
 
 namespace nlssm::refhost {
 
@@ -68,6 +69,7 @@ bool icu_has(const std::string &name) {
 
 int max_char_bytes(const EncodingInfo &info) {
   if (info.converter.rfind("builtin:", 0) == 0) return 5;
+  if (info.converter.rfind(kTablePrefix, 0) == 0) return 1;
   UErrorCode status = U_ZERO_ERROR;
   UConverter *converter = ucnv_open(info.converter.c_str(), &status);
   if (converter == nullptr) return 0;
@@ -92,7 +94,9 @@ EncodingInfo parse_row(const std::vector<std::string> &f) {
   info.ascii = f[5] == "A";
   info.blankValue = hex_value(f[6]);
   info.numberForm = std::stoi(f[7]);
-  if (info.converter.rfind("builtin:", 0) != 0 && !icu_has(info.converter)) {
+  const bool compiled = info.converter.rfind(kTablePrefix, 0) == 0;
+  if (compiled ? TableCodec::find(info.converter) == nullptr
+               : info.converter.rfind("builtin:", 0) != 0 && !icu_has(info.converter)) {
     info.reason = "no converter";
     return info;
   }

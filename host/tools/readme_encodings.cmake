@@ -63,7 +63,9 @@ set(block "${begin_mark}
      (cmake --build <dir> --target nlssm_readme_encodings); do not edit. -->
 
 The reference host (`host/`, target `nlssm_host`) describes ${described} of the
-265 encoding numbers through ICU converters (UTF-EBCDIC with its own codec).
+265 encoding numbers through ICU converters, UTF-EBCDIC with its own codec,
+and single-byte pages that ICU's data lacks (`table:` converters) through
+tables compiled in from the mappings under `data/catalogue/ucm/`.
 Embedding the module with it:
 
 ```cpp
@@ -87,7 +89,8 @@ whose table set names no single encoding,
 | table set | numbers |
 |---|---|
 ${no_encoding}
-and those whose encoding has no converter in the ICU data:
+and those whose encoding has no converter (ISCII 806 is stateful in ICU, not a
+single-byte page, and no mapping of it is compiled in):
 
 | number | name | table set | encoding |
 |---:|---|---|---|

@@ -249,7 +249,9 @@ typedef void (*NLSHostLockReleaseFn)(void *lock);
  * NLSHOST_NUMBER_LEFT; a number wider than the field, or a field wider than
  * the destination, fills what there is with '*' and gives
  * NLSHOST_E_NUMBER_FIELD. Decimals: digits after the decimal separator
- * (0 to 16). */
+ * (0 to 16), or for doubles NLSHOST_DECIMALS_SHORTEST: the shortest text
+ * that reads back as the same double, with fewer digits when the width is
+ * too small for it. */
 #define NLSHOST_SLOT_LOCALE_DESTROY 2
 #define NLSHOST_SLOT_LOCALE_PARSE_DOUBLE_UTF8 3   /* UTF-8 text (encoding 20) */
 #define NLSHOST_SLOT_LOCALE_PARSE_DOUBLE_ASCII 4  /* other ASCII-based encodings */
@@ -265,6 +267,7 @@ typedef void (*NLSHostLockReleaseFn)(void *lock);
 #define NLSHOST_NUMBER_SCIENTIFIC 0x2u /* mantissa and exponent (doubles only) */
 #define NLSHOST_NUMBER_SIGN 0x4u       /* a sign on positive numbers too */
 #define NLSHOST_NUMBER_LEFT 0x8u       /* left-align in the field */
+#define NLSHOST_DECIMALS_SHORTEST (-1) /* decimals argument of the double formatters */
 typedef void (*NLSHostLocaleDestroyFn)(void *locale);
 typedef int64_t (*NLSHostParseDoubleBytesFn)(void *locale, const uint8_t *text, int64_t textBytes,
                                              void *toEncodingConverter, uint32_t options,

@@ -913,11 +913,14 @@ NLSSM_API int64_t ConvertToUTF32(const void *source, int64_t sourceBytes, void *
                                  NLSUTFEncoder encoder);
 /* Encodes sourceBytes / 4 units of `source` (read with `decoder`, whose
  * status is ignored) with `encoder` until the capacity is used up. Note the
- * argument order: encoder first. Returns the encoder's failing status, else 0;
- * `written` = total bytes written. A character that an encoder would write
- * without a capacity check past the end of the destination is not written and
- * stops the loop with NLSSM_E_DEST_TOO_SMALL. Reads no byte past sourceBytes
- * rounded down to whole units. */
+ * argument order: encoder first. Every step hands the encoder the destination
+ * itself at the running offset, with the capacity that remains. Returns the
+ * encoder's failing status, else 0; `written` = total bytes written. When less
+ * room remains than one of the module's encoders writes without a capacity
+ * check (UTF32_UTF8 and UTF16_UTF8: 1 byte, the UTF-16 encoders: 2), the loop
+ * stops with NLSSM_E_DEST_TOO_SMALL before calling it; any other encoder is
+ * trusted to keep within the capacity it is given. Reads no byte past
+ * sourceBytes rounded down to whole units. */
 NLSSM_API int64_t ConvertFromUTF32(const void *source, int64_t sourceBytes, void *destination,
                                    int64_t capacity, int64_t *written, NLSUTFEncoder encoder,
                                    NLSUTFDecoder decoder);
@@ -1256,6 +1259,378 @@ NLSSM_API int64_t NLSStringNormalizeS_UTF8(const NLSSMHandle *handle, const uint
 /* ---- Equality, inequality and ordering comparison ------------------------- */
 
 /* ---- Searching, classification and LIKE ----------------------------------- */
+/* Searches. Positions are 0-based and count characters from where the
+ * scan starts (for single-byte sets, bytes); -1 means not found. A match is
+ * always a run of whole characters: it starts and ends at character
+ * boundaries of the text, so a byte match inside a multi-byte character is
+ * never reported. Shift sequences of modal text are not characters: the
+ * same bytes in single- and double-byte mode are different characters.
+ *
+ * NLSStringIndex (slot 9): the first occurrence of pattern P (from its
+ * current character) in S (from its current character; single-byte sets:
+ * from charIndex). patternLength limits P (0, negative or above P's size:
+ * all of P); it counts bytes for single-byte sets and characters for every
+ * other class. -1 when either descriptor has no current character or S is
+ * empty. Single-byte sets search an empty pattern as the byte at its start
+ * (when the buffer holds one); the other classes find it at 0. */
+NLSSM_API int64_t NLSStringIndex_SBCS(const NLSSMHandle *handle, const NLSString *string,
+                                      const NLSString *pattern, int64_t patternLength);
+NLSSM_API int64_t NLSStringIndex_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                      const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_UTFE(const NLSSMHandle *handle, const NLSString *string,
+                                      const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                      const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                      const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_MBCS_modal(const NLSSMHandle *handle, const NLSString *string,
+                                            const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *string,
+                                               const NLSString *pattern, int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                      const NLSString *string,
+                                                      const NLSString *pattern,
+                                                      int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                      const NLSString *string,
+                                                      const NLSString *pattern,
+                                                      int64_t patternChars);
+NLSSM_API int64_t NLSStringIndex_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                       const NLSString *string,
+                                                       const NLSString *pattern,
+                                                       int64_t patternChars);
+/* NLSStringIndexS (slot 51): raw buffers, lengths in bytes. A pattern
+ * length of 0 gives 0; then a text length of 0 (or a null buffer) gives
+ * -1. */
+NLSSM_API int64_t NLSStringIndexS_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringLength, const uint8_t *pattern,
+                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringLength, const uint8_t *pattern,
+                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_UTFE(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringLength, const uint8_t *pattern,
+                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_WCS2(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringLength, const uint8_t *pattern,
+                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringLength, const uint8_t *pattern,
+                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t stringLength, const uint8_t *pattern,
+                                             int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *string,
+                                                int64_t stringLength, const uint8_t *pattern,
+                                                int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                       const uint8_t *string, int64_t stringLength,
+                                                       const uint8_t *pattern,
+                                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                       const uint8_t *string, int64_t stringLength,
+                                                       const uint8_t *pattern,
+                                                       int64_t patternLength);
+NLSSM_API int64_t NLSStringIndexS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                        const uint8_t *string, int64_t stringLength,
+                                                        const uint8_t *pattern,
+                                                        int64_t patternLength);
+/* NLSStringIndexC (slot 104): as IndexS with lengths in characters (single-
+ * byte sets: bytes). The buffers must hold that many characters. The UTF-8
+ * member serves UTF-EBCDIC handles too, stepping by the handle's encoding;
+ * the WCS2 members serve both byte orders (encoding 24 is big-endian). */
+NLSSM_API int64_t NLSStringIndexC_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringChars, const uint8_t *pattern,
+                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringChars, const uint8_t *pattern,
+                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_WCS2(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringChars, const uint8_t *pattern,
+                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                       int64_t stringChars, const uint8_t *pattern,
+                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t stringChars, const uint8_t *pattern,
+                                             int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *string,
+                                                int64_t stringChars, const uint8_t *pattern,
+                                                int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                       const uint8_t *string, int64_t stringChars,
+                                                       const uint8_t *pattern,
+                                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                       const uint8_t *string, int64_t stringChars,
+                                                       const uint8_t *pattern,
+                                                       int64_t patternChars);
+NLSSM_API int64_t NLSStringIndexC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                        const uint8_t *string, int64_t stringChars,
+                                                        const uint8_t *pattern,
+                                                        int64_t patternChars);
+/* NLSStringContains (slot 28): Index through the handle's NLSStringIndex
+ * slot on descriptors built over the two buffers (lengths in bytes); an
+ * empty pattern or text, or a null buffer, gives -1. The options word is
+ * not read. */
+NLSSM_API int64_t NLSStringContains(const NLSSMHandle *handle, const uint8_t *string,
+                                    int64_t stringLength, const uint8_t *pattern,
+                                    int64_t patternLength, int64_t options);
+/* NLSStringFindCharLit (slot 46): the first occurrence of one character,
+ * given as a byte of the host's literal set (encoding 62), in `count`
+ * characters from the current one (0 or above the rest: to the end; single-
+ * byte sets: bytes from charIndex). The literal is converted through the
+ * handle's charConverter when it has one (single-byte sets: only EBCDIC-
+ * based ones); a failed conversion gives -1. On a match the descriptor moves
+ * to the character found (single-byte sets: charIndex and curOffset become
+ * its byte offset; UTF-EBCDIC sets charIndex, curOffset, prevOffset and
+ * nextOffset by its own sequences; the other classes position it through
+ * stringSetPos); a miss leaves it as it was. */
+NLSSM_API int64_t NLSStringFindCharLit_SBCS(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_UTF8(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_WCS2(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_WCS4(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                                  int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                                     int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_MBCS_EUC_JP(const NLSSMHandle *handle, NLSString *string,
+                                                   int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_MBCS_EUC_TW(const NLSSMHandle *handle, NLSString *string,
+                                                   int64_t count, const uint8_t *literal);
+NLSSM_API int64_t NLSStringFindCharLit_MBCS_GB18030(const NLSSMHandle *handle, NLSString *string,
+                                                    int64_t count, const uint8_t *literal);
+/* NLSStringFindCharLitS (slots 69, 70) and NLSStringFindCharLitC (slots 111,
+ * 112): raw buffers, length in bytes (S) or characters (C). The literal is
+ * converted from encoding 62 only when `convert` is non-zero and the handle
+ * has a converter; otherwise it is one character of the text's encoding,
+ * read as far as its first byte announces (modal text: after an optional
+ * shift sequence). reserved1 and reserved2 are not read. Nothing moves. */
+NLSSM_API int64_t NLSStringFindCharLitS_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_WCS2(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                                   int64_t length, const uint8_t *literal,
+                                                   int64_t reserved1, int64_t reserved2,
+                                                   uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                      const uint8_t *string, int64_t length,
+                                                      const uint8_t *literal, int64_t reserved1,
+                                                      int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_MBCS_EUC_JP(const NLSSMHandle *handle,
+                                                    const uint8_t *string, int64_t length,
+                                                    const uint8_t *literal, int64_t reserved1,
+                                                    int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_MBCS_EUC_TW(const NLSSMHandle *handle,
+                                                    const uint8_t *string, int64_t length,
+                                                    const uint8_t *literal, int64_t reserved1,
+                                                    int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitS_MBCS_GB18030(const NLSSMHandle *handle,
+                                                     const uint8_t *string, int64_t length,
+                                                     const uint8_t *literal, int64_t reserved1,
+                                                     int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_WCS2(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                             int64_t length, const uint8_t *literal,
+                                             int64_t reserved1, int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                                   int64_t length, const uint8_t *literal,
+                                                   int64_t reserved1, int64_t reserved2,
+                                                   uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                      const uint8_t *string, int64_t length,
+                                                      const uint8_t *literal, int64_t reserved1,
+                                                      int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_MBCS_EUC_JP(const NLSSMHandle *handle,
+                                                    const uint8_t *string, int64_t length,
+                                                    const uint8_t *literal, int64_t reserved1,
+                                                    int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_MBCS_EUC_TW(const NLSSMHandle *handle,
+                                                    const uint8_t *string, int64_t length,
+                                                    const uint8_t *literal, int64_t reserved1,
+                                                    int64_t reserved2, uint8_t convert);
+NLSSM_API int64_t NLSStringFindCharLitC_MBCS_GB18030(const NLSSMHandle *handle,
+                                                     const uint8_t *string, int64_t length,
+                                                     const uint8_t *literal, int64_t reserved1,
+                                                     int64_t reserved2, uint8_t convert);
+/* Modal text, a character already in the text's encoding (never
+ * converted): slot 70 (S) and the C form. */
+NLSSM_API int64_t NLSStringFindCharS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                                int64_t length, const uint8_t *character,
+                                                int64_t reserved1, int64_t reserved2,
+                                                uint8_t ignored);
+NLSSM_API int64_t NLSStringFindCharC_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                                int64_t length, const uint8_t *character,
+                                                int64_t reserved1, int64_t reserved2,
+                                                uint8_t ignored);
+/* NLSStringVerify (slot 86): the first character of S (from its current
+ * character, `count` characters; 0 or above the rest: all) that is not one
+ * of the characters of `set` (from its current character, `setCount`
+ * likewise); -1 when every character is in the set or S is empty; 0 for an
+ * empty set and a non-empty S. Single-byte sets count bytes. The UTF-8
+ * member serves UTF-EBCDIC handles, the non-modal member every double-byte
+ * page, EUC-JP, EUC-TW and GB18030 (stepping by the handle's encoding).
+ * NLSStringVerifyS (slot 87): raw buffers, lengths in bytes. */
+NLSSM_API int64_t NLSStringVerify_SBCS(const NLSSMHandle *handle, const NLSString *string,
+                                       int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                       int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_WCS2L(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_WCS2B(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                       int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_MBCS_modal(const NLSSMHandle *handle, const NLSString *string,
+                                             int64_t count, const NLSString *set, int64_t setCount);
+NLSSM_API int64_t NLSStringVerify_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *string,
+                                                int64_t count, const NLSString *set,
+                                                int64_t setCount);
+NLSSM_API int64_t NLSStringVerifyS_SBCS(const NLSSMHandle *handle, const uint8_t *string,
+                                        int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_UTF8(const NLSSMHandle *handle, const uint8_t *string,
+                                        int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_WCS2L(const NLSSMHandle *handle, const uint8_t *string,
+                                         int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_WCS2B(const NLSSMHandle *handle, const uint8_t *string,
+                                         int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_WCS4(const NLSSMHandle *handle, const uint8_t *string,
+                                        int64_t length, const uint8_t *set, int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *string,
+                                              int64_t length, const uint8_t *set,
+                                              int64_t setLength);
+NLSSM_API int64_t NLSStringVerifyS_MBCS_nonmodal(const NLSSMHandle *handle, const uint8_t *string,
+                                                 int64_t length, const uint8_t *set,
+                                                 int64_t setLength);
+
+/* Classification (slots 73-78): 1 when the current character is in a
+ * class of `mask` (the class-table bits: 0x01 upper, 0x02 lower, 0x04
+ * digit, 0x08 space, 0x10 punctuation, 0x20 blank, 0x40 control, 0x80
+ * hexadecimal digit), else 0; 0 when there is no current character. The
+ * count word is not read.
+ * Single-byte sets: the class table. IsSpace also takes 0x09-0x0D (ASCII)
+ * or 0x0B-0x0D (EBCDIC) as space.
+ * Multi-byte classes read the descriptor's charKind (0: no character): a
+ * single-byte character uses the class table (NLSStringIs_MBCS: byte 0x80
+ * in no class); NLSStringIs_MBCS counts any wider character in every class
+ * but punctuation (mask 0x10); IsDigit answers 0 for it; IsLower looks the
+ * double-byte code up in the double-byte case table (with mask bit 0x02:
+ * its lower form is itself, without: its upper form is); IsXDigit takes
+ * the double-byte hexadecimal ranges; IsSpace the encoding's double-byte
+ * space (and ASCII 0x09-0x0D, or EBCDIC 0x05, 0x0B-0x0D, 0x25); IsGraph
+ * counts every double-byte character but the double-byte space.
+ * Unicode (UTF-8, which also serves UTF-EBCDIC handles, WCS2, WCS4): the
+ * decoded character's general category from the host's character-
+ * information query; a high surrogate without its low one, an undecodable
+ * sequence or a failed query give 0. IsSpace takes a strict flag instead
+ * of the count and mask: U+0020, U+00A0, U+1680, U+2000-U+200A, U+2028,
+ * U+2029, U+202F, U+205F, U+3000, and unless strict also U+0009-U+000D and
+ * U+0085. IsXDigit: A-F, a-f, their full-width forms and decimal digits
+ * (mask not read). IsGraph: not a separator, control, format, surrogate or
+ * unassigned character (mask not read). */
+NLSSM_API int64_t NLSStringIs_SBCS(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_ASCII(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_EBCDIC(const NLSSMHandle *handle, const NLSString *string,
+                                          int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIs_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsLower_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsDigit_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsXDigit_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsGraph_MBCS(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_MBCS_ASCII(const NLSSMHandle *handle, const NLSString *string,
+                                              int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_MBCS_EBCDIC(const NLSSMHandle *handle, const NLSString *string,
+                                               int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIs_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t strict);
+NLSSM_API int64_t NLSStringIsXDigit_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsGraph_UTF8(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIs_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t strict);
+NLSSM_API int64_t NLSStringIsXDigit_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsGraph_WCS2(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIs_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                   int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsSpace_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t strict);
+NLSSM_API int64_t NLSStringIsXDigit_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                         int64_t ignored, int32_t mask);
+NLSSM_API int64_t NLSStringIsGraph_WCS4(const NLSSMHandle *handle, const NLSString *string,
+                                        int64_t ignored, int32_t mask);
+/* stringAnyNot (slot 118, every class): 1 when any of `count` characters
+ * from the current one (0 or negative: all of them) is not in a class of
+ * `mask`, as the handle's NLSStringIs slot answers character by character
+ * (stepping with its stringNextChar slot); 0 when all are, or there is no
+ * character. The descriptor does not move. */
+NLSSM_API int64_t stringAnyNot(const NLSSMHandle *handle, const NLSString *string, int64_t count,
+                               int32_t mask);
+
+/* LIKE (slot 27): 1 when the whole text (from its current character)
+ * matches the pattern (from its current character), 0 when not, or
+ * NLSSM_E_NULL_ARGUMENT for a null handle or descriptor, or a null buffer
+ * under a non-empty descriptor. A descriptor without a current character
+ * holds the empty string. Matching is by whole characters: '%' matches any
+ * run of characters (also none), '_' exactly one character; with `escape`
+ * non-zero the escape character (backslash) makes the pattern character after it
+ * literal (an escape at the end of the pattern stands for itself). The
+ * three pattern characters are those of the encoding's family (ASCII % _ and
+ * backslash, EBCDIC 0x6C 0x6D 0xE0; UTF-EBCDIC uses the EBCDIC ones, wide text the
+ * units of the ASCII values), and in modal text only single-byte
+ * characters act as them. Time grows at worst with text length times
+ * pattern length. NLSStringLike_MBCS_nonmodal serves UTF-8, UTF-EBCDIC,
+ * WCS2 and WCS4 handles; the nonmodal2 members every double-byte page,
+ * EUC-JP, EUC-TW and GB18030; the modal member takes the family from the
+ * handle. */
+NLSSM_API int64_t NLSStringLike_SBCS_ASCII(const NLSSMHandle *handle, const NLSString *text,
+                                           const NLSString *pattern, int64_t escape);
+NLSSM_API int64_t NLSStringLike_SBCS_EBCDIC(const NLSSMHandle *handle, const NLSString *text,
+                                            const NLSString *pattern, int64_t escape);
+NLSSM_API int64_t NLSStringLike_MBCS_nonmodal(const NLSSMHandle *handle, const NLSString *text,
+                                              const NLSString *pattern, int64_t escape);
+NLSSM_API int64_t NLSStringLike_MBCS_modal(const NLSSMHandle *handle, const NLSString *text,
+                                           const NLSString *pattern, int64_t escape);
+NLSSM_API int64_t NLSStringLike_MBCS_nonmodal2_ASCII(const NLSSMHandle *handle,
+                                                     const NLSString *text,
+                                                     const NLSString *pattern, int64_t escape);
+NLSSM_API int64_t NLSStringLike_MBCS_nonmodal2_EBCDIC(const NLSSMHandle *handle,
+                                                      const NLSString *text,
+                                                      const NLSString *pattern, int64_t escape);
 
 /* ---- Substring, delete, reverse and strip --------------------------------- */
 
@@ -1264,6 +1639,148 @@ NLSSM_API int64_t NLSStringNormalizeS_UTF8(const NLSSMHandle *handle, const uint
 /* ---- Transliterate, tranword, squeeze and remove-delimiters --------------- */
 
 /* ---- Number parsing and formatting ---------------------------------------- */
+/* Slots 29-32. Every member takes the handle, then a host locale object (null:
+ * the handle's own "en_US" locale). Texts and destinations are at most 152
+ * bytes: a longer text, or a capacity above 152 or below 0, gives
+ * NLSSM_E_NUMBER_TOO_LONG before anything is read; a null text, destination
+ * or out pointer gives NLSSM_E_NULL_ARGUMENT. Host statuses are returned
+ * unchanged.
+ *
+ * Parse integer: blanks, an optional '+' or '-', blanks, digits. Empty or
+ * all-blank text reads as 0 (status 0, all consumed); a sign without digits
+ * is NLSSM_E_NOT_A_NUMBER. After the digits a blank or NUL ends the number;
+ * any other character gives NLSSM_E_NOT_A_NUMBER with the value read so far
+ * (neither is consumed). With flag NLSSM_NUMBER_STRICT_TAIL only blanks,
+ * optionally ended by a NUL, may follow (the blanks are consumed). Overflow:
+ * NLSSM_E_INT_OVERFLOW, value 0, every digit consumed. `consumed` counts
+ * bytes: the 32-bit forms read bytes / 4 units of 4 bytes (the _swap2 form
+ * too, after reversing the bytes of each 16-bit unit; _swap4 reverses each
+ * 32-bit unit) and report units x 4; _toQVChar converts with the handle's
+ * ownFromConverter and reports characters x unitWidth. */
+#define NLSSM_NUMBER_STRICT_TAIL 0x1000u
+NLSSM_API int64_t NLSStringToIntmax_ASCII(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, uint32_t flags, int64_t *value,
+                                          int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_EBCDIC(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, uint32_t flags,
+                                           int64_t *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_QVChar(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, uint32_t flags,
+                                           int64_t *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_swap2(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, uint32_t flags, int64_t *value,
+                                          int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_swap4(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, uint32_t flags, int64_t *value,
+                                          int32_t *consumed);
+NLSSM_API int64_t NLSStringToIntmax_toQVChar(const NLSSMHandle *handle, void *locale,
+                                             const void *text, int64_t textBytes, uint32_t flags,
+                                             int64_t *value, int32_t *consumed);
+
+/* Parse double: the locale's parser reads the text (the UTF-8 entry for
+ * encoding 20, the ASCII entry for other ASCII-based encodings, the EBCDIC
+ * entry, or the 32-bit entry after the same unit handling as the integer
+ * parsers); options go to it unchanged (NLSHOST_PARSE_STRICT_TAIL). The fifth
+ * argument is ignored. On a non-zero status `consumed` is not written. */
+NLSSM_API int64_t NLSStringToDouble_ASCII(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, int64_t reserved, uint32_t options,
+                                          double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_EBCDIC(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, int64_t reserved,
+                                           uint32_t options, double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_QVChar(const NLSSMHandle *handle, void *locale,
+                                           const void *text, int64_t textBytes, int64_t reserved,
+                                           uint32_t options, double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_swap2(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, int64_t reserved, uint32_t options,
+                                          double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_swap4(const NLSSMHandle *handle, void *locale, const void *text,
+                                          int64_t textBytes, int64_t reserved, uint32_t options,
+                                          double *value, int32_t *consumed);
+NLSSM_API int64_t NLSStringToDouble_toQVChar(const NLSSMHandle *handle, void *locale,
+                                             const void *text, int64_t textBytes, int64_t reserved,
+                                             uint32_t options, double *value, int32_t *consumed);
+
+/* Format integer. A width above the capacity fills the capacity with '*'
+ * (NLSSM_E_NUMBER_DOES_NOT_FIT). With flags (NLSHOST_NUMBER_*) and a value
+ * other than 0 the locale formats; otherwise the module writes the number
+ * right-aligned in `width` characters with blanks on the left, or the whole
+ * field in '*' with NLSSM_E_NUMBER_DOES_NOT_FIT when it does not fit. A width
+ * of 0 or less means the number's own width. The _ASCII and _EBCDIC forms
+ * write one byte per character (digits, blank, apostrophe, '*', '+', ',',
+ * '-', '.'; U+00A0 as the encoding's no-break-space substitute; EBCDIC
+ * writes the apostrophe as its substitute too; anything else '?' or 0x6F);
+ * the _MBCS forms copy a multi-byte substitute whole and, when it does not
+ * fit, fill the rest with '*' and give NLSSM_E_DEST_TOO_SMALL. The 32-bit
+ * forms write capacity / 4 characters as 4-byte units (_swap2 reversing the
+ * bytes of each 16-bit unit, _swap4 of each 32-bit unit) and report
+ * characters x 4; _fromQVChar converts with the handle's ownToConverter. */
+NLSSM_API int64_t NLSStringFromIntmax_ASCII_SBCS(const NLSSMHandle *handle, void *locale,
+                                                 int64_t value, int64_t width, uint32_t flags,
+                                                 void *destination, int64_t capacity,
+                                                 int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_EBCDIC_SBCS(const NLSSMHandle *handle, void *locale,
+                                                  int64_t value, int64_t width, uint32_t flags,
+                                                  void *destination, int64_t capacity,
+                                                  int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_ASCII_MBCS(const NLSSMHandle *handle, void *locale,
+                                                 int64_t value, int64_t width, uint32_t flags,
+                                                 void *destination, int64_t capacity,
+                                                 int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_EBCDIC_MBCS(const NLSSMHandle *handle, void *locale,
+                                                  int64_t value, int64_t width, uint32_t flags,
+                                                  void *destination, int64_t capacity,
+                                                  int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_QVChar(const NLSSMHandle *handle, void *locale, int64_t value,
+                                             int64_t width, uint32_t flags, void *destination,
+                                             int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_swap2(const NLSSMHandle *handle, void *locale, int64_t value,
+                                            int64_t width, uint32_t flags, void *destination,
+                                            int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_swap4(const NLSSMHandle *handle, void *locale, int64_t value,
+                                            int64_t width, uint32_t flags, void *destination,
+                                            int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromIntmax_fromQVChar(const NLSSMHandle *handle, void *locale,
+                                                 int64_t value, int64_t width, uint32_t flags,
+                                                 void *destination, int64_t capacity,
+                                                 int32_t *written);
+
+/* Format double: always the locale's formatter (decimals 0-16, or
+ * NLSHOST_DECIMALS_SHORTEST), then written as the integer forms write; 'E'
+ * and 'e' are kept. The locale's status is returned even when output was
+ * written. _UTF8 has the locale write UTF-8 straight into the destination. */
+NLSSM_API int64_t NLSStringFromDouble_ASCII_SBCS(const NLSSMHandle *handle, void *locale,
+                                                 double value, int64_t width, int64_t decimals,
+                                                 uint32_t flags, void *destination,
+                                                 int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_EBCDIC_SBCS(const NLSSMHandle *handle, void *locale,
+                                                  double value, int64_t width, int64_t decimals,
+                                                  uint32_t flags, void *destination,
+                                                  int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_ASCII_MBCS(const NLSSMHandle *handle, void *locale,
+                                                 double value, int64_t width, int64_t decimals,
+                                                 uint32_t flags, void *destination,
+                                                 int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_EBCDIC_MBCS(const NLSSMHandle *handle, void *locale,
+                                                  double value, int64_t width, int64_t decimals,
+                                                  uint32_t flags, void *destination,
+                                                  int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_UTF8(const NLSSMHandle *handle, void *locale, double value,
+                                           int64_t width, int64_t decimals, uint32_t flags,
+                                           void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_QVChar(const NLSSMHandle *handle, void *locale, double value,
+                                             int64_t width, int64_t decimals, uint32_t flags,
+                                             void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_swap2(const NLSSMHandle *handle, void *locale, double value,
+                                            int64_t width, int64_t decimals, uint32_t flags,
+                                            void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_swap4(const NLSSMHandle *handle, void *locale, double value,
+                                            int64_t width, int64_t decimals, uint32_t flags,
+                                            void *destination, int64_t capacity, int32_t *written);
+NLSSM_API int64_t NLSStringFromDouble_fromQVChar(const NLSSMHandle *handle, void *locale,
+                                                 double value, int64_t width, int64_t decimals,
+                                                 uint32_t flags, void *destination,
+                                                 int64_t capacity, int32_t *written);
 
 /* ---- Bidirectional text --------------------------------------------------- */
 

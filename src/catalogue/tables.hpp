@@ -134,7 +134,7 @@ extern const uint8_t zpcs_lcs[256], zpcs_ucs[256], zpcs_ccl[256];
 extern const uint8_t zwin_lcs[256], zwin_ucs[256], zwin_ccl[256];
 
 // Double-byte case tables and their hexadecimal-digit ranges.
-extern const DbcsRecord jeuc_dbtab[186];
+extern const DbcsRecord jeuc_dbtab[166];
 extern const DbcsRange jeuc_xdttab[2];
 extern const DbcsRecord jhit_dbtab[166];
 extern const DbcsRange jhit_xdttab[2];
@@ -142,7 +142,7 @@ extern const DbcsRecord jibm_dbtab[186];
 extern const DbcsRange jibm_xdttab[2];
 extern const DbcsRecord jspc_dbtab[186];
 extern const DbcsRange jspc_xdttab[2];
-extern const DbcsRecord jwin_dbtab[186];
+extern const DbcsRecord jwin_dbtab[166];
 extern const DbcsRange jwin_xdttab[2];
 extern const DbcsRecord kibm_dbtab[209];
 extern const DbcsRange kibm_xdttab[2];
@@ -313,11 +313,11 @@ inline constexpr SbcsSet sbcs_sets[] = {
 };
 
 inline constexpr DbcsSet dbcs_sets[] = {
-    {"jeuc", jeuc_dbtab, 186, jeuc_xdttab},
+    {"jeuc", jeuc_dbtab, 166, jeuc_xdttab},
     {"jhit", jhit_dbtab, 166, jhit_xdttab},
     {"jibm", jibm_dbtab, 186, jibm_xdttab},
     {"jspc", jspc_dbtab, 186, jspc_xdttab},
-    {"jwin", jwin_dbtab, 186, jwin_xdttab},
+    {"jwin", jwin_dbtab, 166, jwin_xdttab},
     {"kibm", kibm_dbtab, 209, kibm_xdttab},
     {"kiso", kiso_dbtab, 209, kiso_xdttab},
     {"kwin", kwin_dbtab, 209, kwin_xdttab},

@@ -474,12 +474,12 @@ const TrantabRow sm_trantab[kTrantabRows] = {
     {idty_tbl, idty_tbl, idty_tbl, zero_ccl, zero_dbtab, 1, nullptr, 0},  // 130
     {jlat_lcs, jlat_ucs, jlat_lcs, jlat_ccl, jhit_dbtab, 166, jhit_xdttab, 2},  // 131
     {jlat_lcs, jlat_ucs, jlat_lcs, jlat_ccl, jhit_dbtab, 166, jhit_xdttab, 2},  // 132
-    {j895_lcs, j895_ucs, j895_lcs, j895_ccl, jeuc_dbtab, 186, jeuc_xdttab, 2},  // 133
-    {j895_lcs, j895_ucs, j895_lcs, j895_ccl, jeuc_dbtab, 186, jeuc_xdttab, 2},  // 134
-    {jpc_lcs, jpc_ucs, jpc_lcs, jpc_ccl, jwin_dbtab, 186, jwin_xdttab, 2},  // 135
-    {jwin_lcs, jwin_ucs, jwin_lcs, jwin_ccl, jwin_dbtab, 186, jwin_xdttab, 2},  // 136
-    {jpc_lcs, jpc_ucs, jpc_lcs, jpc_ccl, jwin_dbtab, 186, jwin_xdttab, 2},  // 137
-    {jpc_lcs, jpc_ucs, jpc_lcs, jpc_ccl, jwin_dbtab, 186, jwin_xdttab, 2},  // 138
+    {j895_lcs, j895_ucs, j895_lcs, j895_ccl, jeuc_dbtab, 166, jeuc_xdttab, 2},  // 133
+    {j895_lcs, j895_ucs, j895_lcs, j895_ccl, jeuc_dbtab, 166, jeuc_xdttab, 2},  // 134
+    {jpc_lcs, jpc_ucs, jpc_lcs, jpc_ccl, jwin_dbtab, 166, jwin_xdttab, 2},  // 135
+    {jwin_lcs, jwin_ucs, jwin_lcs, jwin_ccl, jwin_dbtab, 166, jwin_xdttab, 2},  // 136
+    {jpc_lcs, jpc_ucs, jpc_lcs, jpc_ccl, jwin_dbtab, 166, jwin_xdttab, 2},  // 137
+    {jpc_lcs, jpc_ucs, jpc_lcs, jpc_ccl, jwin_dbtab, 166, jwin_xdttab, 2},  // 138
     {k833_lcs, k833_ucs, k833_lcs, k833_ccl, kibm_dbtab, 209, kibm_xdttab, 2},  // 139
     {krom_lcs, krom_ucs, krom_lcs, krom_ccl, kwin_dbtab, 209, kwin_xdttab, 2},  // 140
     {kwin_lcs, kwin_ucs, kwin_lcs, kwin_ccl, kwin_dbtab, 209, kwin_xdttab, 2},  // 141
@@ -589,7 +589,7 @@ const TrantabRow sm_trantab[kTrantabRows] = {
     {acro_lcs, acro_ucs, acro_lcs, acro_ccl, nullptr, 0, nullptr, 0},  // 245
     {acyr_lcs, acyr_ucs, acyr_lcs, acyr_ccl, nullptr, 0, nullptr, 0},  // 246
     {arma_lcs, arma_ucs, arma_lcs, arma_ccl, nullptr, 0, nullptr, 0},  // 247
-    {jpc_lcs, jpc_ucs, jpc_lcs, jpc_ccl, jwin_dbtab, 186, jwin_xdttab, 2},  // 248
+    {jpc_lcs, jpc_ucs, jpc_lcs, jpc_ccl, jwin_dbtab, 166, jwin_xdttab, 2},  // 248
     {nullptr, nullptr, nullptr, zero_ccl, nullptr, 0, nullptr, 0},  // 249
     {nullptr, nullptr, nullptr, zero_ccl, nullptr, 0, nullptr, 0},  // 250
     {nullptr, nullptr, nullptr, zero_ccl, nullptr, 0, nullptr, 0},  // 251

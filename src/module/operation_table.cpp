@@ -70,6 +70,13 @@ const std::array kRows = {
     Row{8,  // NLSAllBlanks
         {same(op(&NLSAllBlanks_SBCS)), same(op(&NLSAllBlanks)), same(op(&NLSAllBlanks_WCS)),
          same(op(&NLSAllBlanks_WCS)), same(op(&NLSAllBlanks_MBCS_modal)), same(op(&NLSAllBlanks))}},
+    Row{9,  // NLSStringIndex
+        {same(op(&NLSStringIndex_SBCS)), utf(op(&NLSStringIndex_UTF8), op(&NLSStringIndex_UTFE)),
+         same(op(&NLSStringIndex_WCS2)), same(op(&NLSStringIndex_WCS4)),
+         same(op(&NLSStringIndex_MBCS_modal)),
+         dbcs(op(&NLSStringIndex_MBCS_nonmodal), op(&NLSStringIndex_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringIndex_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringIndex_MBCS_nonmodal_GB18030))}},
     Row{11,  // NLSStringLower
         {same(op(&NLSStringLower_SBCS)), utf(op(&NLSStringLower_UTF8), op(&NLSStringLower_UTFE)),
          endian(op(&NLSStringLower_WCS2L), op(&NLSStringLower_WCS2B)),
@@ -116,6 +123,49 @@ const std::array kRows = {
         {same(op(&stringCurCharSize_FixedSize)), same(op(&stringCurCharSize_UTF8)),
          same(op(&stringCurCharSize_WCS2)), same(op(&stringCurCharSize_FixedSize)),
          same(op(&stringCurCharSize_MBCS_modal)), same(op(&stringCurCharSize_MBCS_nonmodal))}},
+    Row{27,  // NLSStringLike
+        {ascii_ebcdic(op(&NLSStringLike_SBCS_ASCII), op(&NLSStringLike_SBCS_EBCDIC)),
+         same(op(&NLSStringLike_MBCS_nonmodal)), same(op(&NLSStringLike_MBCS_nonmodal)),
+         same(op(&NLSStringLike_MBCS_nonmodal)), same(op(&NLSStringLike_MBCS_modal)),
+         ascii_ebcdic(op(&NLSStringLike_MBCS_nonmodal2_ASCII),
+                      op(&NLSStringLike_MBCS_nonmodal2_EBCDIC))}},
+    every_class(28, op(&NLSStringContains)),
+    Row{29,  // NLSStringFromDouble
+        {ascii_ebcdic(op(&NLSStringFromDouble_ASCII_SBCS), op(&NLSStringFromDouble_EBCDIC_SBCS)),
+         utf(op(&NLSStringFromDouble_UTF8), op(&NLSStringFromDouble_EBCDIC_MBCS)),
+         number_form(op(&NLSStringFromDouble_QVChar), op(&NLSStringFromDouble_swap2),
+                     op(&NLSStringFromDouble_fromQVChar)),
+         number_form(op(&NLSStringFromDouble_QVChar), op(&NLSStringFromDouble_swap4),
+                     op(&NLSStringFromDouble_fromQVChar)),
+         ascii_ebcdic(op(&NLSStringFromDouble_ASCII_MBCS), op(&NLSStringFromDouble_EBCDIC_MBCS)),
+         ascii_ebcdic(op(&NLSStringFromDouble_ASCII_MBCS), op(&NLSStringFromDouble_EBCDIC_MBCS))}},
+    Row{30,  // NLSStringFromIntmax
+        {ascii_ebcdic(op(&NLSStringFromIntmax_ASCII_SBCS), op(&NLSStringFromIntmax_EBCDIC_SBCS)),
+         utf(op(&NLSStringFromIntmax_ASCII_MBCS), op(&NLSStringFromIntmax_EBCDIC_MBCS)),
+         number_form(op(&NLSStringFromIntmax_QVChar), op(&NLSStringFromIntmax_swap2),
+                     op(&NLSStringFromIntmax_fromQVChar)),
+         number_form(op(&NLSStringFromIntmax_QVChar), op(&NLSStringFromIntmax_swap4),
+                     op(&NLSStringFromIntmax_fromQVChar)),
+         ascii_ebcdic(op(&NLSStringFromIntmax_ASCII_MBCS), op(&NLSStringFromIntmax_EBCDIC_MBCS)),
+         ascii_ebcdic(op(&NLSStringFromIntmax_ASCII_MBCS), op(&NLSStringFromIntmax_EBCDIC_MBCS))}},
+    Row{31,  // NLSStringToDouble
+        {ascii_ebcdic(op(&NLSStringToDouble_ASCII), op(&NLSStringToDouble_EBCDIC)),
+         utf(op(&NLSStringToDouble_ASCII), op(&NLSStringToDouble_EBCDIC)),
+         number_form(op(&NLSStringToDouble_QVChar), op(&NLSStringToDouble_swap2),
+                     op(&NLSStringToDouble_toQVChar)),
+         number_form(op(&NLSStringToDouble_QVChar), op(&NLSStringToDouble_swap4),
+                     op(&NLSStringToDouble_toQVChar)),
+         ascii_ebcdic(op(&NLSStringToDouble_ASCII), op(&NLSStringToDouble_EBCDIC)),
+         ascii_ebcdic(op(&NLSStringToDouble_ASCII), op(&NLSStringToDouble_EBCDIC))}},
+    Row{32,  // NLSStringToIntmax
+        {ascii_ebcdic(op(&NLSStringToIntmax_ASCII), op(&NLSStringToIntmax_EBCDIC)),
+         utf(op(&NLSStringToIntmax_ASCII), op(&NLSStringToIntmax_EBCDIC)),
+         number_form(op(&NLSStringToIntmax_QVChar), op(&NLSStringToIntmax_swap2),
+                     op(&NLSStringToIntmax_toQVChar)),
+         number_form(op(&NLSStringToIntmax_QVChar), op(&NLSStringToIntmax_swap4),
+                     op(&NLSStringToIntmax_toQVChar)),
+         ascii_ebcdic(op(&NLSStringToIntmax_ASCII), op(&NLSStringToIntmax_EBCDIC)),
+         ascii_ebcdic(op(&NLSStringToIntmax_ASCII), op(&NLSStringToIntmax_EBCDIC))}},
     Row{40,  // NLSStringByteLength
         {same(op(&NLSStringByteLength_SBCS)),
          utf(op(&NLSStringByteLength_UTF8), op(&NLSStringByteLength_UTFE)),
@@ -123,6 +173,12 @@ const std::array kRows = {
          same(op(&NLSStringByteLength_MBCS_modal)),
          dbcs(op(&NLSStringByteLength_MBCS_nonmodal), op(&NLSStringByteLength_MBCS_EUC_JP),
               op(&NLSStringByteLength_MBCS_EUC_TW), op(&NLSStringByteLength_MBCS_GB18030))}},
+    Row{46,  // NLSStringFindCharLit
+        {same(op(&NLSStringFindCharLit_SBCS)), same(op(&NLSStringFindCharLit_UTF8)),
+         same(op(&NLSStringFindCharLit_WCS2)), same(op(&NLSStringFindCharLit_WCS4)),
+         same(op(&NLSStringFindCharLit_MBCS_modal)),
+         dbcs(op(&NLSStringFindCharLit_MBCS_nonmodal), op(&NLSStringFindCharLit_MBCS_EUC_JP),
+              op(&NLSStringFindCharLit_MBCS_EUC_TW), op(&NLSStringFindCharLit_MBCS_GB18030))}},
     Row{48,  // NLSNumCharsS
         {same(op(&NLSNumCharsS_SBCS)), utf(op(&NLSNumCharsS_UTF8), op(&NLSNumCharsS_UTFE)),
          same(op(&NLSNumCharsS_WCS2)), same(op(&NLSNumCharsS_WCS4)),
@@ -136,6 +192,13 @@ const std::array kRows = {
         {same(op(&NLSAllBlanksS_SBCS)), same(op(&NLSAllBlanksS)), same(op(&NLSAllBlanksS_WCS)),
          same(op(&NLSAllBlanksS_WCS)), same(op(&NLSAllBlanksS_MBCS_modal)),
          same(op(&NLSAllBlanksS))}},
+    Row{51,  // NLSStringIndexS
+        {same(op(&NLSStringIndexS_SBCS)), utf(op(&NLSStringIndexS_UTF8), op(&NLSStringIndexS_UTFE)),
+         same(op(&NLSStringIndexS_WCS2)), same(op(&NLSStringIndexS_WCS4)),
+         same(op(&NLSStringIndexS_MBCS_modal)),
+         dbcs(op(&NLSStringIndexS_MBCS_nonmodal), op(&NLSStringIndexS_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringIndexS_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringIndexS_MBCS_nonmodal_GB18030))}},
     Row{53,  // NLSStringLowerS
         {same(op(&NLSStringLowerS_SBCS)), utf(op(&NLSStringLowerS_UTF8), op(&NLSStringLowerS_UTFE)),
          endian(op(&NLSStringLowerS_WCS2L), op(&NLSStringLowerS_WCS2B)),
@@ -158,12 +221,59 @@ const std::array kRows = {
          endian(op(&NLSStringNormalizeS_WCS2L), op(&NLSStringNormalizeS_WCS2B)),
          endian(op(&NLSStringNormalizeS_WCS4L), op(&NLSStringNormalizeS_WCS4B)),
          same(op(&NLSStringNormalizeS_MBCS_modal)), same(op(&NLSStringNormalizeS_MBCS_nonmodal))}},
+    Row{69,  // NLSStringFindCharLitS
+        {same(op(&NLSStringFindCharLitS_SBCS)), same(op(&NLSStringFindCharLitS_UTF8)),
+         same(op(&NLSStringFindCharLitS_WCS2)), same(op(&NLSStringFindCharLitS_WCS4)),
+         same(op(&NLSStringFindCharLitS_MBCS_modal)),
+         dbcs(op(&NLSStringFindCharLitS_MBCS_nonmodal), op(&NLSStringFindCharLitS_MBCS_EUC_JP),
+              op(&NLSStringFindCharLitS_MBCS_EUC_TW), op(&NLSStringFindCharLitS_MBCS_GB18030))}},
+    Row{70,  // NLSStringFindCharS
+        {same(op(&NLSStringFindCharLitS_SBCS)), same(op(&NLSStringFindCharLitS_UTF8)),
+         same(op(&NLSStringFindCharLitS_WCS2)), same(op(&NLSStringFindCharLitS_WCS4)),
+         same(op(&NLSStringFindCharS_MBCS_modal)),
+         dbcs(op(&NLSStringFindCharLitS_MBCS_nonmodal), op(&NLSStringFindCharLitS_MBCS_EUC_JP),
+              op(&NLSStringFindCharLitS_MBCS_EUC_TW), op(&NLSStringFindCharLitS_MBCS_GB18030))}},
     Row{72,  // NLSStringLength
         {same(op(&NLSStringLength_SBCS)), utf(op(&NLSStringLength_UTF8), op(&NLSStringLength_UTFE)),
          same(op(&NLSStringLength_WCS2)), same(op(&NLSStringLength_WCS4)),
          same(op(&NLSStringLength_MBCS_modal)),
          dbcs(op(&NLSStringLength_MBCS_nonmodal), op(&NLSStringLength_MBCS_EUC_JP),
               op(&NLSStringLength_MBCS_EUC_TW), op(&NLSStringLength_MBCS_GB18030))}},
+    Row{73,  // NLSStringIs
+        {same(op(&NLSStringIs_SBCS)), same(op(&NLSStringIs_UTF8)), same(op(&NLSStringIs_WCS2)),
+         same(op(&NLSStringIs_WCS4)), same(op(&NLSStringIs_MBCS)), same(op(&NLSStringIs_MBCS))}},
+    Row{74,  // NLSStringIsLower
+        {same(op(&NLSStringIs_SBCS)), same(op(&NLSStringIs_UTF8)), same(op(&NLSStringIs_WCS2)),
+         same(op(&NLSStringIs_WCS4)), same(op(&NLSStringIsLower_MBCS)),
+         same(op(&NLSStringIsLower_MBCS))}},
+    Row{75,  // NLSStringIsDigit
+        {same(op(&NLSStringIs_SBCS)), same(op(&NLSStringIs_UTF8)), same(op(&NLSStringIs_WCS2)),
+         same(op(&NLSStringIs_WCS4)), same(op(&NLSStringIsDigit_MBCS)),
+         same(op(&NLSStringIsDigit_MBCS))}},
+    Row{76,  // NLSStringIsSpace
+        {ascii_ebcdic(op(&NLSStringIsSpace_ASCII), op(&NLSStringIsSpace_EBCDIC)),
+         same(op(&NLSStringIsSpace_UTF8)), same(op(&NLSStringIsSpace_WCS2)),
+         same(op(&NLSStringIsSpace_WCS4)),
+         ascii_ebcdic(op(&NLSStringIsSpace_MBCS_ASCII), op(&NLSStringIsSpace_MBCS_EBCDIC)),
+         same(op(&NLSStringIsSpace_MBCS_ASCII))}},
+    Row{77,  // NLSStringIsXDigit
+        {same(op(&NLSStringIs_SBCS)), same(op(&NLSStringIsXDigit_UTF8)),
+         same(op(&NLSStringIsXDigit_WCS2)), same(op(&NLSStringIsXDigit_WCS4)),
+         same(op(&NLSStringIsXDigit_MBCS)), same(op(&NLSStringIsXDigit_MBCS))}},
+    Row{78,  // NLSStringIsGraph
+        {same(op(&NLSStringIs_SBCS)), same(op(&NLSStringIsGraph_UTF8)),
+         same(op(&NLSStringIsGraph_WCS2)), same(op(&NLSStringIsGraph_WCS4)),
+         same(op(&NLSStringIsGraph_MBCS)), same(op(&NLSStringIsGraph_MBCS))}},
+    Row{86,  // NLSStringVerify
+        {same(op(&NLSStringVerify_SBCS)), same(op(&NLSStringVerify_UTF8)),
+         endian(op(&NLSStringVerify_WCS2L), op(&NLSStringVerify_WCS2B)),
+         same(op(&NLSStringVerify_WCS4)), same(op(&NLSStringVerify_MBCS_modal)),
+         same(op(&NLSStringVerify_MBCS_nonmodal))}},
+    Row{87,  // NLSStringVerifyS
+        {same(op(&NLSStringVerifyS_SBCS)), same(op(&NLSStringVerifyS_UTF8)),
+         endian(op(&NLSStringVerifyS_WCS2L), op(&NLSStringVerifyS_WCS2B)),
+         same(op(&NLSStringVerifyS_WCS4)), same(op(&NLSStringVerifyS_MBCS_modal)),
+         same(op(&NLSStringVerifyS_MBCS_nonmodal))}},
     Row{101,  // NLSStringNLength
         {same(op(&NLSStringNLength_SBCS)), same(op(&NLSStringNLength_UTF8)),
          same(op(&NLSStringNLength_WCS2)), same(op(&NLSStringNLength_WCS4)),
@@ -176,6 +286,13 @@ const std::array kRows = {
          same(op(&NLSStringBLength_MBCS_modal)),
          dbcs(op(&NLSStringBLength_MBCS_nonmodal), op(&NLSStringBLength_MBCS_EUC_JP),
               op(&NLSStringBLength_MBCS_EUC_TW), op(&NLSStringBLength_MBCS_GB18030))}},
+    Row{104,  // NLSStringIndexC
+        {same(op(&NLSStringIndexC_SBCS)), same(op(&NLSStringIndexC_UTF8)),
+         same(op(&NLSStringIndexC_WCS2)), same(op(&NLSStringIndexC_WCS4)),
+         same(op(&NLSStringIndexC_MBCS_modal)),
+         dbcs(op(&NLSStringIndexC_MBCS_nonmodal), op(&NLSStringIndexC_MBCS_nonmodal_EUC_JP),
+              op(&NLSStringIndexC_MBCS_nonmodal_EUC_TW),
+              op(&NLSStringIndexC_MBCS_nonmodal_GB18030))}},
     Row{106,  // NLSStringLowerC
         {same(op(&NLSStringLowerC_SBCS)), same(op(&NLSStringLowerC_UTF8)),
          endian(op(&NLSStringLowerC_WCS2L), op(&NLSStringLowerC_WCS2B)),
@@ -192,12 +309,25 @@ const std::array kRows = {
          dbcs(op(&NLSStringUpperC_MBCS_nonmodal), op(&NLSStringUpperC_MBCS_nonmodal_EUC_JP),
               op(&NLSStringUpperC_MBCS_nonmodal_EUC_TW),
               op(&NLSStringUpperC_MBCS_nonmodal_GB18030))}},
+    Row{111,  // NLSStringFindCharLitC
+        {same(op(&NLSStringFindCharLitC_SBCS)), same(op(&NLSStringFindCharLitC_UTF8)),
+         same(op(&NLSStringFindCharLitC_WCS2)), same(op(&NLSStringFindCharLitC_WCS4)),
+         same(op(&NLSStringFindCharLitC_MBCS_modal)),
+         dbcs(op(&NLSStringFindCharLitC_MBCS_nonmodal), op(&NLSStringFindCharLitC_MBCS_EUC_JP),
+              op(&NLSStringFindCharLitC_MBCS_EUC_TW), op(&NLSStringFindCharLitC_MBCS_GB18030))}},
+    Row{112,  // NLSStringFindCharC
+        {same(op(&NLSStringFindCharLitC_SBCS)), same(op(&NLSStringFindCharLitC_UTF8)),
+         same(op(&NLSStringFindCharLitC_WCS2)), same(op(&NLSStringFindCharLitC_WCS4)),
+         same(op(&NLSStringFindCharLitC_MBCS_modal)),
+         dbcs(op(&NLSStringFindCharLitC_MBCS_nonmodal), op(&NLSStringFindCharLitC_MBCS_EUC_JP),
+              op(&NLSStringFindCharLitC_MBCS_EUC_TW), op(&NLSStringFindCharLitC_MBCS_GB18030))}},
     Row{114,  // NLSStringByteLengthC
         {same(op(&NLSStringByteLengthC_SBCS)), same(op(&NLSStringByteLengthC_UTF8)),
          same(op(&NLSStringByteLengthC_WCS2)), same(op(&NLSStringByteLengthC_WCS4)),
          same(op(&NLSStringByteLengthC_MBCS_modal)),
          dbcs(op(&NLSStringByteLengthC_MBCS_nonmodal), op(&NLSStringByteLengthC_MBCS_EUC_JP),
               op(&NLSStringByteLengthC_MBCS_EUC_TW), op(&NLSStringByteLengthC_MBCS_GB18030))}},
+    every_class(118, op(&stringAnyNot)),
 };
 
 bool is_class_independent(const Row &row) {

@@ -152,6 +152,8 @@ struct Utf32Decoder {
 // 0x10000 up takes the four-byte form, whatever its lead byte becomes.
 struct Utf8Encoder {
   static constexpr bool kFixedWidth4 = false;
+  // Bytes it may write without looking at the capacity.
+  static constexpr int64_t kUncheckedBytes = 1;
 
   static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
     if (c < 0x80) {
@@ -178,6 +180,7 @@ struct Utf8Encoder {
 // One UTF-16 unit: a surrogate becomes its own three-byte sequence.
 struct Utf16UnitToUtf8Encoder {
   static constexpr bool kFixedWidth4 = false;
+  static constexpr int64_t kUncheckedBytes = 1;
 
   static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
     return Utf8Encoder::encode(c & 0xFFFF, d, capacity, written);
@@ -188,6 +191,7 @@ struct Utf16UnitToUtf8Encoder {
 template <Order O>
 struct Utf16UnitEncoder {
   static constexpr bool kFixedWidth4 = false;
+  static constexpr int64_t kUncheckedBytes = 2;
 
   static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t, int64_t *written) {
     store16<O>(d, c);
@@ -201,6 +205,7 @@ struct Utf16UnitEncoder {
 template <Order O>
 struct Utf16Encoder {
   static constexpr bool kFixedWidth4 = false;
+  static constexpr int64_t kUncheckedBytes = 2;
 
   static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
     if (c < 0x10000) {
@@ -220,6 +225,7 @@ struct Utf16Encoder {
 template <Order O>
 struct Utf32Encoder {
   static constexpr bool kFixedWidth4 = true;
+  static constexpr int64_t kUncheckedBytes = 0;
   static constexpr bool kBigEndian = kIsBig<O>;
 
   static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
@@ -271,6 +277,7 @@ struct PolicyEncoder {
     else
       return false;
   }();
+  static constexpr int64_t unchecked_bytes() { return Policy::kUncheckedBytes; }
   uint32_t operator()(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) const {
     return Policy::encode(c, d, capacity, written);
   }
@@ -285,6 +292,10 @@ struct PointerDecoder {
 struct PointerEncoder {
   static constexpr bool kFixedWidth4 = false;
   NLSUTFEncoder fn;
+  // What the function may write without looking at the capacity: known for
+  // the module's own encoders, 0 (it checks) for any other.
+  int64_t unchecked = 0;
+  int64_t unchecked_bytes() const { return unchecked; }
   uint32_t operator()(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) const {
     return static_cast<uint32_t>(fn(c, d, capacity, written));
   }
@@ -340,13 +351,14 @@ uint32_t convert_to_utf32(const uint8_t *source, int64_t source_bytes, uint8_t *
 }
 
 // Reads 32-bit units from `source` through `decode` (whose status is not
-// consulted: a unit always yields a value) and encodes each into
-// `destination` until the units or the capacity run out.
+// consulted: a unit always yields a value) and encodes each straight into
+// `destination` at the running offset, with the capacity that remains, until
+// the units or the capacity run out.
 //
-// Some encoders write a short form without looking at the capacity; near the
-// end of the destination the driver lets them write into a scratch area and
-// copies the result only if it fits, so that nothing lands past the capacity:
-// a character that does not fit stops the loop as "destination too small".
+// Some encoders write a short form without looking at the capacity; when
+// less room remains than such a form takes, the loop stops with "destination
+// too small" before calling the encoder, so that nothing lands past the
+// capacity.
 template <typename Decoder, typename Encoder>
 uint32_t convert_from_utf32(const uint8_t *source, int64_t source_bytes, uint8_t *destination,
                             int64_t capacity, int64_t *written, Encoder encode, Decoder decode) {
@@ -354,7 +366,6 @@ uint32_t convert_from_utf32(const uint8_t *source, int64_t source_bytes, uint8_t
     put(written, int64_t{0});
     return NLSSM_OK;
   }
-  constexpr int64_t kScratch = 16;
   const int64_t units = source_bytes / 4;
   int64_t total = 0;
   int64_t room = capacity;
@@ -363,20 +374,13 @@ uint32_t convert_from_utf32(const uint8_t *source, int64_t source_bytes, uint8_t
     uint32_t c = 0;
     int64_t used = 0;
     decode(source + 4 * i, source_bytes - 4 * i, &c, &used);
-    int64_t out = 0;
-    if (room >= kScratch) {
-      status = encode(c, destination + total, room, &out);
-      if (status != NLSSM_OK) break;
-    } else {
-      uint8_t scratch[kScratch];
-      status = encode(c, scratch, room, &out);
-      if (status != NLSSM_OK) break;
-      if (out > room || out < 0) {
-        status = NLSSM_E_DEST_TOO_SMALL;
-        break;
-      }
-      std::memcpy(destination + total, scratch, static_cast<size_t>(out));
+    if (room < encode.unchecked_bytes()) {
+      status = NLSSM_E_DEST_TOO_SMALL;
+      break;
     }
+    int64_t out = 0;
+    status = encode(c, destination + total, room, &out);
+    if (status != NLSSM_OK) break;
     total += out;
     room -= out;
   }

@@ -68,6 +68,15 @@ extern "C" uint32_t BYTE_UTF16_UTF32_SWAP(const uint8_t *bytes) {
 
 namespace {
 
+// Bytes the module's own encoders write without looking at the capacity.
+int64_t unchecked_bytes_of(NLSUTFEncoder encoder) {
+  if (encoder == &UTF32_UTF16 || encoder == &UTF32_UTF16_SWAP || encoder == &UTF32_UTF16s ||
+      encoder == &UTF32_UTF16s_SWAP)
+    return 2;
+  if (encoder == &UTF32_UTF8 || encoder == &UTF16_UTF8) return 1;
+  return 0;
+}
+
 // The drivers compile their loop for the common codecs (recognised by the
 // address of their exported function) and call any other through its pointer.
 template <typename Decoder>
@@ -79,7 +88,8 @@ int64_t to_utf32_encoding(const uint8_t *s, int64_t n, uint8_t *d, int64_t capac
   if (encoder == &COPY_UTF32)
     return u::convert_to_utf32(s, n, d, capacity, written, decode,
                                u::PolicyEncoder<u::Utf32Encoder<Order::big>>{});
-  return u::convert_to_utf32(s, n, d, capacity, written, decode, u::PointerEncoder{encoder});
+  return u::convert_to_utf32(s, n, d, capacity, written, decode,
+                             u::PointerEncoder{encoder, unchecked_bytes_of(encoder)});
 }
 
 template <typename Decoder>
@@ -94,7 +104,8 @@ int64_t from_utf32_encoding(const uint8_t *s, int64_t n, uint8_t *d, int64_t cap
   if (encoder == &UTF32_UTF16s_SWAP)
     return u::convert_from_utf32(s, n, d, capacity, written,
                                  u::PolicyEncoder<u::Utf16Encoder<Order::big>>{}, decode);
-  return u::convert_from_utf32(s, n, d, capacity, written, u::PointerEncoder{encoder}, decode);
+  return u::convert_from_utf32(s, n, d, capacity, written,
+                               u::PointerEncoder{encoder, unchecked_bytes_of(encoder)}, decode);
 }
 
 }  // namespace

@@ -4,6 +4,7 @@
 #include <climits>
 #include <set>
 #include <string>
+#include <vector>
 
 #include "catalogue/tables.hpp"
 #include "nlssm/nlssm.h"
@@ -37,15 +38,22 @@ TEST(BidiTables, SharedClassesAndStructure) {
     SCOPED_TRACE(s.name);
     const BidiTable &t = *s.table;
     const bool ebcdic = s.name[0] == 'e';
-    const int blank = ebcdic ? 0x40 : ' ', zero = ebcdic ? 0xF0 : '0', upperA = ebcdic ? 0xC1 : 'A';
-    EXPECT_EQ(t.categories[blank], kBidiWS);
-    EXPECT_EQ(t.categories[0x0C], kBidiWS);  // form feed, at the same byte in both families
-    for (int d = 0; d < 10; ++d) EXPECT_EQ(t.categories[zero + d], kBidiEN);
-    for (int l = 0; l < 9; ++l) EXPECT_EQ(t.categories[upperA + l], kBidiL);
-    if (!ebcdic) {
-      for (int b : {'#', '$', '%'}) EXPECT_EQ(t.categories[b], kBidiAsciiET) << b;
-      for (int b : {',', '.', '/', ':'}) EXPECT_EQ(t.categories[b], kBidiAsciiCS) << b;
-      for (int b = 'a'; b <= 'z'; ++b) EXPECT_EQ(t.categories[b], kBidiL) << b;
+    // Runs of bytes with the class every table of the family carries.
+    struct Run {
+      int first, last;
+      uint32_t category;
+    };
+    const std::vector<Run> stated =
+        ebcdic
+            ? std::vector<Run>{{0x40, 0x40, kBidiWS}, {0x0C, 0x0C, kBidiWS}, {0xF0, 0xF9, kBidiEN},
+                               {0xC1, 0xC9, kBidiL},  {0xD1, 0xD9, kBidiL},  {0xE2, 0xE9, kBidiL},
+                               {0x81, 0x89, kBidiL},  {0x91, 0x99, kBidiL},  {0xA2, 0xA9, kBidiL}}
+            : std::vector<Run>{
+                  {' ', ' ', kBidiWS},      {0x0C, 0x0C, kBidiWS},    {'0', '9', kBidiEN},
+                  {'A', 'Z', kBidiL},       {'a', 'z', kBidiL},       {'#', '%', kBidiAsciiET},
+                  {',', ',', kBidiAsciiCS}, {'.', '/', kBidiAsciiCS}, {':', ':', kBidiAsciiCS}};
+    for (const Run &run : stated) {
+      for (int b = run.first; b <= run.last; ++b) EXPECT_EQ(t.categories[b], run.category) << b;
     }
     int strongRightToLeft = 0;
     for (int b = 0; b < 256; ++b) {
@@ -60,11 +68,16 @@ TEST(BidiTables, SharedClassesAndStructure) {
 }
 
 TEST(BidiTables, WorkedExamples) {
-  // Hebrew letters of EBCDIC 424.
-  for (int b = 0x41; b <= 0x71; ++b) {
-    const bool letter =
-        (b <= 0x49) || (b >= 0x51 && b <= 0x59) || (b >= 0x62 && b <= 0x69) || b == 0x71;
-    EXPECT_EQ(bidi_e424.categories[b] == kBidiR, letter) << b;
+  // Hebrew letters of EBCDIC 424, in both of its tables.
+  for (const BidiTable *t : {&bidi_e424, &bidi_eoiw}) {
+    for (int b = 0x41; b <= 0x7F; ++b) {
+      const bool letter = (b <= 0x49) || (b >= 0x51 && b <= 0x59) || (b >= 0x62 && b <= 0x69) ||
+                          b == 0x71 || b == 0x78;
+      EXPECT_EQ(t->categories[b] == kBidiR, letter) << b;
+      if (letter) {
+        EXPECT_EQ(t->reorder[b], kBidiR) << b;
+      }
+    }
   }
   EXPECT_EQ(bidi_e424.categories[0x81], kBidiL);  // lower-case a
   // ISO 8859-8: the reduced table drops the form feed and 0x7B-0xDF, and

@@ -12,7 +12,6 @@ namespace {
 
 // The character of a double-byte code in a page of the given form.
 UChar32 decode_code(const catgen::CodePage &page, const std::string &form, uint16_t code) {
-  if (form == "seven") code = uint16_t(code + 0x8080);
   std::string bytes{char(code >> 8), char(code & 0xFF)};
   if (form == "modal") bytes = "\x0E" + bytes + "\x0F";
   return page.decode(bytes);

@@ -11,6 +11,16 @@ using namespace hosttest;
 
 namespace {
 
+// An ICU converter for a registry converter name. The pages the host
+// compiles in ("table:<page>[,swaplfnl]") open from the same mappings built
+// by ICU's makeconv, an independent reading of them (without the swap).
+UConverter *open_icu(const std::string &converter, UErrorCode &error) {
+  const std::string prefix = "table:";
+  if (converter.rfind(prefix, 0) != 0) return ucnv_open(converter.c_str(), &error);
+  const std::string page = converter.substr(prefix.size(), converter.find(',') - prefix.size());
+  return ucnv_openPackage(NLSSM_CATALOGUE_CNV_DIR "/", page.c_str(), &error);
+}
+
 // Up to `limit` code points spread over the converter's round-trip set.
 std::u32string repertoire_sample(const char *converter, std::size_t limit) {
   std::u32string all;
@@ -19,7 +29,7 @@ std::u32string repertoire_sample(const char *converter, std::size_t limit) {
       if (c < 0xD800 || c > 0xDFFF) all.push_back(c);
   } else {
     UErrorCode error = U_ZERO_ERROR;
-    UConverter *cnv = ucnv_open(converter, &error);
+    UConverter *cnv = open_icu(converter, error);
     USet *set = uset_openEmpty();
     ucnv_getUnicodeSet(cnv, set, UCNV_ROUNDTRIP_SET, &error);
     for (int32_t r = 0; r < uset_getItemCount(set); ++r) {
@@ -66,6 +76,48 @@ Converter between(void *nls, std::int64_t from, std::int64_t to) {
 }
 
 }  // namespace
+
+// The compiled pages read every byte as ICU reads the same mapping (with
+// line feed and next line exchanged in the swapped variants) and write
+// every character they read back as its byte.
+TEST(Converters, CompiledPagesAgreeWithTheirMappingsByteForByte) {
+  auto host = standalone();
+  void *nls = host->nls();
+  int pages = 0;
+  for (const auto &row : nlssm::refhost::Registry::instance().rows()) {
+    if (!row.described || row.converter.rfind("table:", 0) != 0) continue;
+    SCOPED_TRACE(row.number);
+    ++pages;
+    UErrorCode error = U_ZERO_ERROR;
+    UConverter *icu = open_icu(row.converter, error);
+    ASSERT_TRUE(U_SUCCESS(error));
+    const bool swapped = row.converter.find(",swaplfnl") != std::string::npos;
+    Converter from{
+        call<NLSHostConverterForFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_FROM, std::int64_t{row.number},
+                                    static_cast<void *>(nullptr), static_cast<void *>(nullptr))};
+    Converter to{call<NLSHostConverterForFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_TO,
+                                             std::int64_t{row.number}, static_cast<void *>(nullptr),
+                                             static_cast<void *>(nullptr))};
+    for (int b = 0; b < 256; ++b) {
+      const char byte = static_cast<char>(b);
+      UChar units[4];
+      error = U_ZERO_ERROR;
+      ucnv_setToUCallBack(icu, UCNV_TO_U_CALLBACK_STOP, nullptr, nullptr, nullptr, &error);
+      const int32_t n = ucnv_toUChars(icu, units, 4, &byte, 1, &error);
+      std::string decoded;
+      ASSERT_EQ(from.convert(std::string(1, byte), decoded), 0);
+      if (U_FAILURE(error) || n != 1) continue;  // unassigned in the page
+      char32_t expected = units[0];
+      if (swapped && (expected == 0x0A || expected == 0x85)) expected ^= 0x0A ^ 0x85;
+      EXPECT_EQ(decoded, host_chars(std::u32string(1, expected))) << b;
+      std::string encoded;
+      ASSERT_EQ(to.convert(decoded, encoded), 0);
+      EXPECT_EQ(encoded, std::string(1, byte)) << b;
+    }
+    ucnv_close(icu);
+  }
+  EXPECT_EQ(pages, 19);  // 228 (ISCII) has no single-byte converter
+}
 
 TEST(Converters, EveryDescribedEncodingRoundTripsItsRepertoire) {
   auto host = standalone();

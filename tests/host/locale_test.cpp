@@ -106,8 +106,11 @@ TEST(Locale, FormatDoubles) {
   std::string out;
   EXPECT_EQ(locale.format(1234.5, 10, 2, NLSHOST_NUMBER_GROUPING, out), 0);
   EXPECT_EQ(out, "  1,234.50");
+  // Rounded from the binary value: 1234.5 is a tie (to even), 2.675 lies below.
   EXPECT_EQ(locale.format(1234.5, 0, 0, 0, out), 0);
-  EXPECT_EQ(out, "1235");  // rounds half up
+  EXPECT_EQ(out, "1234");
+  EXPECT_EQ(locale.format(2.675, 0, 2, 0, out), 0);
+  EXPECT_EQ(out, "2.67");
   EXPECT_EQ(locale.format(12345, 0, 2, NLSHOST_NUMBER_SCIENTIFIC, out), 0);
   EXPECT_EQ(out, "1.23E4");
   EXPECT_EQ(locale.format(5, 4, 0, NLSHOST_NUMBER_SIGN | NLSHOST_NUMBER_LEFT, out), 0);
@@ -118,6 +121,29 @@ TEST(Locale, FormatDoubles) {
   EXPECT_EQ(out, "****");
   EXPECT_EQ(locale.format(1, 0, 0, 0x100, out), NLSHOST_E_BAD_OPTIONS);
   EXPECT_EQ(locale.format(1, 0, 17, 0, out), NLSHOST_E_BAD_OPTIONS);
+}
+
+TEST(Locale, ShortestDoublesShrinkToTheWidth) {
+  Locale locale;
+  std::string out;
+  const struct {
+    double value;
+    std::int64_t width;
+    std::uint32_t flags;
+    const char *text;
+  } cases[] = {{0.1, 0, 0, "0.1"},
+               {1234567.25, 0, NLSHOST_NUMBER_GROUPING, "1,234,567.25"},
+               {1234.5678, 6, 0, "1234.6"},
+               {-1e300, 0, 0, "-1E300"},
+               {1.0 / 3, 7, 0, "0.33333"},
+               {6.02214076e23, 9, 0, "6.0221E23"},
+               {2.5e-7, 0, NLSHOST_NUMBER_SCIENTIFIC, "2.5E-7"}};
+  for (const auto &c : cases) {
+    EXPECT_EQ(locale.format(c.value, c.width, NLSHOST_DECIMALS_SHORTEST, c.flags, out), 0);
+    EXPECT_EQ(out, c.text);
+  }
+  EXPECT_EQ(locale.format(-1e300, 3, NLSHOST_DECIMALS_SHORTEST, 0, out), NLSHOST_E_NUMBER_FIELD);
+  EXPECT_EQ(out, "***");
 }
 
 TEST(Locale, FormatIntegersAndUtf8) {

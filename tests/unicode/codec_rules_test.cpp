@@ -238,6 +238,64 @@ TEST(FromUtf32Driver, UncheckedUnitWritesStayInsideTheCapacity) {
   }
 }
 
+// An encoder supplied by the caller sees the destination itself, at the
+// running offset, with the capacity that remains.
+struct EncoderCall {
+  uint8_t *destination;
+  int64_t capacity;
+};
+std::vector<EncoderCall> encoder_calls;
+int64_t recording_encoder(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
+  encoder_calls.push_back({d, capacity});
+  const int64_t n = c < 0x80 ? 1 : 3;  // a variable-width form
+  if (capacity < n) return NLSSM_E_DEST_TOO_SMALL;
+  for (int64_t i = 0; i < n; ++i) d[i] = static_cast<uint8_t>(c);
+  *written = n;
+  return NLSSM_OK;
+}
+
+TEST(FromUtf32Driver, EveryStepEncodesIntoTheDestinationAtItsOffset) {
+  const uint32_t text[] = {'a', 0x100, 'b', 0x200, 'c'};
+  uint8_t out[9];
+  int64_t written = -1;
+  encoder_calls.clear();
+  EXPECT_EQ(ConvertFromUTF32(text, sizeof text, out, sizeof out, &written, recording_encoder,
+                             COPY_UTF32b_SWAP),
+            NLSSM_OK);
+  EXPECT_EQ(written, 9);
+  ASSERT_EQ(encoder_calls.size(), 5u);
+  const int64_t offsets[] = {0, 1, 4, 5, 8};
+  for (size_t i = 0; i < encoder_calls.size(); ++i) {
+    EXPECT_EQ(encoder_calls[i].destination, out + offsets[i]) << i;
+    EXPECT_EQ(encoder_calls[i].capacity, 9 - offsets[i]) << i;
+  }
+  // With little room left the encoder still gets the real destination.
+  encoder_calls.clear();
+  EXPECT_EQ(
+      ConvertFromUTF32(text, sizeof text, out, 3, &written, recording_encoder, COPY_UTF32b_SWAP),
+      NLSSM_E_DEST_TOO_SMALL);
+  ASSERT_EQ(encoder_calls.size(), 2u);
+  EXPECT_EQ(encoder_calls[1].destination, out + 1);
+  EXPECT_EQ(encoder_calls[1].capacity, 2);
+  EXPECT_EQ(written, 1);
+}
+
+// Every encoder of the module, every capacity: nothing past the capacity.
+TEST(FromUtf32Driver, ModuleEncodersNeverWritePastTheCapacity) {
+  const uint32_t text[] = {'a', 0xE9, 0x20AC, 0x1F600, 'z', 0xD800, 0x10FFFF};
+  for (NLSUTFEncoder enc : {UTF32_UTF8, UTF16_UTF8, COPY_UTF32, COPY_UTF32_SWAP, UTF32_UTF16,
+                            UTF32_UTF16_SWAP, UTF32_UTF16s, UTF32_UTF16s_SWAP}) {
+    for (int64_t capacity = 0; capacity <= 32; ++capacity) {
+      std::vector<uint8_t> out(static_cast<size_t>(capacity) + 8, 0xEE);
+      int64_t written = -1;
+      ConvertFromUTF32(text, sizeof text, out.data(), capacity, &written, enc, COPY_UTF32b_SWAP);
+      EXPECT_LE(written, capacity);
+      for (size_t i = static_cast<size_t>(capacity); i < out.size(); ++i)
+        ASSERT_EQ(out[i], 0xEE) << "capacity " << capacity << " byte " << i;
+    }
+  }
+}
+
 struct LegalCase {
   std::vector<uint8_t> bytes;
   int64_t length, legal, index;

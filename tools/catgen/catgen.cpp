@@ -104,19 +104,19 @@ SbcsSet build_sbcs(const TsvRow &row, const std::string &cnvDir) {
   return set;
 }
 
-enum class DbcsForm { kMixed, kModal, kSeven };
+enum class DbcsForm { kMixed, kModal };
 
+// Only a round-trip mapping counts: a code the page merely falls back to
+// for the character reads back as another character in text.
 int dbcs_code(const CodePage &page, DbcsForm form, UChar32 c) {
   const std::string s = page.encode(c);
+  if (s.empty() || page.decode(s) != c) return -1;
   auto byte = [&](size_t i) { return int(uint8_t(s[i])); };
   switch (form) {
     case DbcsForm::kMixed:
       return s.size() == 2 ? byte(0) << 8 | byte(1) : -1;
     case DbcsForm::kModal:
       return s.size() == 4 && byte(0) == 0x0E && byte(3) == 0x0F ? byte(1) << 8 | byte(2) : -1;
-    case DbcsForm::kSeven:
-      return s.size() == 2 && byte(0) >= 0xA1 && byte(1) >= 0xA1 ? (byte(0) << 8 | byte(1)) - 0x8080
-                                                                 : -1;
   }
   return -1;
 }
@@ -134,7 +134,18 @@ std::pair<uint16_t, uint16_t> dbcs_run(const CodePage &page, DbcsForm form, UCha
   return {uint16_t(low), uint16_t(low + count - 1)};
 }
 
-DbcsSet build_dbcs(const TsvRow &row, const std::string &cnvDir) {
+// The character that a double-byte code reads as in a page, or -1.
+UChar32 dbcs_char(const CodePage &page, DbcsForm form, int code) {
+  std::string bytes{char(code >> 8), char(code & 0xFF)};
+  if (form == DbcsForm::kModal) bytes = "\x0E" + bytes + "\x0F";
+  return page.decode(bytes);
+}
+
+// `users`: the code pages of the encodings whose rows carry the table. A
+// record is kept only when its code and both cases read as the same
+// characters in every one of them, since it is applied to their text.
+DbcsSet build_dbcs(const TsvRow &row, const std::string &cnvDir,
+                   const std::vector<std::unique_ptr<CodePage>> &users) {
   DbcsSet set;
   set.name = row[0];
   DbcsForm form;
@@ -142,8 +153,6 @@ DbcsSet build_dbcs(const TsvRow &row, const std::string &cnvDir) {
     form = DbcsForm::kMixed;
   } else if (row[2] == "modal") {
     form = DbcsForm::kModal;
-  } else if (row[2] == "seven") {
-    form = DbcsForm::kSeven;
   } else {
     fail(set.name + ": unknown form " + row[2]);
   }
@@ -158,6 +167,12 @@ DbcsSet build_dbcs(const TsvRow &row, const std::string &cnvDir) {
     if (lower < 0) lower = code;
     if (upper < 0) upper = code;
     if (lower == code && upper == code) continue;
+    const bool sameInUsers = std::all_of(users.begin(), users.end(), [&](const auto &user) {
+      return dbcs_char(*user, form, code) == c &&
+             dbcs_char(*user, form, lower) == (lower == code ? c : lowerChar) &&
+             dbcs_char(*user, form, upper) == (upper == code ? c : upperChar);
+    });
+    if (!sameInUsers) continue;
     set.records.push_back({uint16_t(code), uint16_t(lower), uint16_t(upper)});
   }
   std::sort(set.records.begin(), set.records.end(),
@@ -185,6 +200,22 @@ Bidi build_bidi(const TsvRow &row, const std::map<std::string, const SbcsSet *> 
     const uint32_t category = c < 0 ? 0xFFFFFFFFu : bidi_category(c);
     bidi.categories[b] = category;
     bidi.reorder[b] = c >= 0 && bidi_reorder_keeps(c, category) ? category : 0xFFFFFFFFu;
+  }
+  // The classes the tables are defined to carry win over what the code
+  // page's current mapping derives (EBCDIC 424 keeps 0x78 a Hebrew letter).
+  std::vector<BidiByteClass> stated = family_bidi_classes(set->second->ebcdic);
+  if (row.size() > 3) {
+    const std::vector<BidiByteClass> own = parse_bidi_classes(row[3]);
+    stated.insert(stated.end(), own.begin(), own.end());
+  }
+  // The reduced table takes the fixed class where it keeps the byte at all,
+  // and always for the right-to-left letters.
+  for (const BidiByteClass &run : stated) {
+    for (int b = run.first; b <= run.last; ++b) {
+      bidi.categories[b] = run.category;
+      if (bidi.reorder[b] != 0xFFFFFFFFu || run.category == 3 || run.category == 4)
+        bidi.reorder[b] = run.category;
+    }
   }
   const char brackets[] = "()[]{}<>";
   for (int i = 0; i < 8; ++i) {
@@ -228,8 +259,18 @@ Catalogue build(const std::string &dataDir, const std::string &cnvDir) {
     if (!setByName.emplace(set.name, &set).second) fail("duplicate set " + set.name);
   }
   std::map<std::string, const DbcsSet *> dbcsByName;
+  // The converters of the encodings that use each double-byte table: the
+  // table set column of encodings.tsv names it after a '+'.
+  std::map<std::string, std::vector<std::unique_ptr<CodePage>>> dbcsUsers;
+  for (const TsvRow &row : read_tsv(dataDir + "/encodings.tsv", 9)) {
+    const size_t plus = row[3].find('+');
+    const std::string &converter = row[8];
+    if (plus == std::string::npos || converter == "-" || converter.find(':') != std::string::npos)
+      continue;
+    dbcsUsers[row[3].substr(plus + 1)].push_back(std::make_unique<CodePage>(converter, cnvDir));
+  }
   for (const TsvRow &row : read_tsv(dataDir + "/catalogue/dbcs_sets.tsv", 3)) {
-    cat.dbcs.push_back(build_dbcs(row, cnvDir));
+    cat.dbcs.push_back(build_dbcs(row, cnvDir, dbcsUsers[row[0]]));
   }
   for (const DbcsSet &set : cat.dbcs) dbcsByName.emplace(set.name, &set);
   for (const TsvRow &row : read_tsv(dataDir + "/catalogue/bidi_tables.tsv", 3)) {

@@ -1,5 +1,8 @@
 #include "rules.hpp"
 
+#include <sstream>
+#include <stdexcept>
+
 #include <unicode/uchar.h>
 
 namespace catgen {
@@ -71,6 +74,36 @@ uint32_t bidi_category(UChar32 c) {
 
 bool bidi_reorder_keeps(UChar32 c, uint32_t category) {
   return category == 3 || category == 4 || (c >= 0x20 && c <= 0x7E);
+}
+
+std::vector<BidiByteClass> family_bidi_classes(bool ebcdic) {
+  constexpr uint32_t L = 0, EN = 8, WS = 17, AsciiET = 110, AsciiCS = 112;
+  if (ebcdic) {
+    return {{0x40, 0x40, WS}, {0x0C, 0x0C, WS}, {0xF0, 0xF9, EN}, {0xC1, 0xC9, L}, {0xD1, 0xD9, L},
+            {0xE2, 0xE9, L},  {0x81, 0x89, L},  {0x91, 0x99, L},  {0xA2, 0xA9, L}};
+  }
+  return {{' ', ' ', WS},      {0x0C, 0x0C, WS},    {'0', '9', EN},
+          {'A', 'Z', L},       {'a', 'z', L},       {'#', '%', AsciiET},
+          {',', ',', AsciiCS}, {'.', '/', AsciiCS}, {':', ':', AsciiCS}};
+}
+
+std::vector<BidiByteClass> parse_bidi_classes(const std::string &text) {
+  std::vector<BidiByteClass> classes;
+  const size_t colon = text.rfind(':');
+  if (text.empty()) return classes;
+  if (colon == std::string::npos)
+    throw std::runtime_error("bidi classes without category: " + text);
+  const auto category = static_cast<uint32_t>(std::stoul(text.substr(colon + 1)));
+  std::stringstream runs(text.substr(0, colon));
+  for (std::string run; runs >> run;) {
+    const size_t dash = run.find('-');
+    const int first = std::stoi(run.substr(0, dash), nullptr, 16);
+    const int last =
+        dash == std::string::npos ? first : std::stoi(run.substr(dash + 1), nullptr, 16);
+    if (first < 0 || last > 255 || first > last) throw std::runtime_error("bad bidi run " + run);
+    classes.push_back({first, last, category});
+  }
+  return classes;
 }
 
 }  // namespace catgen

@@ -5,6 +5,8 @@
 #include <unicode/umachine.h>
 
 #include <cstdint>
+#include <string>
+#include <vector>
 
 namespace catgen {
 
@@ -29,6 +31,22 @@ uint32_t bidi_category(UChar32 c);
 // Whether the reduced second table keeps the category: the letters of the
 // right-to-left scripts and the printable ASCII characters.
 bool bidi_reorder_keeps(UChar32 c, uint32_t category);
+
+// A run of bytes that a single-byte bidirectional table gives a fixed
+// category, whatever the code page's mapping derives for them.
+struct BidiByteClass {
+  int first, last;
+  uint32_t category;
+};
+
+// The classes every table of a family carries at that family's positions:
+// letters, digits, blank and form feed, and in ASCII tables the number
+// terminators and separators of ASCII.
+std::vector<BidiByteClass> family_bidi_classes(bool ebcdic);
+
+// Extra classes of one table, written in bidi_tables.tsv as space-separated
+// runs of hexadecimal bytes with their category: "41-49 51-59 71:3".
+std::vector<BidiByteClass> parse_bidi_classes(const std::string &text);
 
 }  // namespace catgen
 
