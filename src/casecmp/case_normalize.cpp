@@ -58,6 +58,13 @@ int64_t room_at(const NLSString &dst, int64_t position) {
   return std::max<int64_t>(0, static_cast<int64_t>(dst.capacity) - position);
 }
 
+// The destination's length covers `end` (never past its capacity: a
+// position beyond it wrote nothing).
+void grow_to(NLSString &dst, int64_t end) {
+  const auto covered = static_cast<uint64_t>(end);
+  if (covered <= dst.capacity) dst.length = std::max(dst.length, covered);
+}
+
 // ---- Byte tables, mapped while copying ---------------------------------------
 
 // Single byte: `count` bytes (0, or more than the source holds: all of
@@ -73,7 +80,7 @@ int64_t normalize_sbcs(const NLSSMHandle *h, const NLSString *src, NLSString *ds
   const int64_t n = std::min(wanted, room_at(*dst, start));
   map_bytes(case_table(h, normalize_case(options)), src->buffer + src->curOffset,
             dst->buffer + start, n);
-  dst->length = std::max<uint64_t>(dst->length, static_cast<uint64_t>(start + n));
+  grow_to(*dst, start + n);
   return wanted > n ? kTooSmall : kOk;
 }
 
@@ -99,6 +106,7 @@ int64_t normalize_modal(const NLSSMHandle *h, const NLSString *src, NLSString *d
   if (src == nullptr || dst == nullptr) return kNullArgument;
   if (src->length == 0 || src->curOffset < 0 || dst->length == 0 || dst->curOffset < 0) return kOk;
   if (dst->buffer == nullptr || src->buffer == nullptr) return kNullArgument;
+  if (dst->curOffset > static_cast<int64_t>(dst->capacity)) return kTooSmall;  // nothing fits
   const cursor::ModalModel m(h);
   const bool srcDouble = src->charKind != NLSSM_KIND_SINGLE;
   const bool dstDouble = dst->charKind != NLSSM_KIND_SINGLE;
@@ -143,7 +151,7 @@ int64_t normalize_generic(const NLSSMHandle *h, const NLSString *src, NLSString 
     int64_t counted = 0;
     const int64_t r = GetNumBytes(h, src, count, 0, &counted, nullptr);
     shortSource = static_cast<uint32_t>(r) == NLSSM_GETNUMBYTES_OUTSIDE;
-    if (r == kOk || shortSource) bytes = std::min(counted, bytes);
+    if (r == kOk || shortSource) bytes = std::clamp<int64_t>(counted, 0, bytes);
   }
   const int64_t start = dst->curOffset;
   const int64_t room = room_at(*dst, start);
@@ -153,7 +161,7 @@ int64_t normalize_generic(const NLSSMHandle *h, const NLSString *src, NLSString 
     status = kTooSmall;
   }
   std::memmove(dst->buffer + start, src->buffer + src->curOffset, static_cast<size_t>(bytes));
-  dst->length = std::max<uint64_t>(dst->length, static_cast<uint64_t>(start + bytes));
+  grow_to(*dst, start + bytes);
   if (dst->length != 0 && h->stringSetPos != nullptr)
     reinterpret_cast<SetPosFn>(h->stringSetPos)(h, dst, NLSSM_POS_CURRENT, 0);
   if ((cut || shortSource) && count > 0) {

@@ -60,6 +60,9 @@ TEST(SingleByte, NormalizeCutsToTheRoomAndGrowsTheDestination) {
   to.curOffset = -5;                           // clamped to the start
   EXPECT_EQ(normalize(h, from, to, 2, 3), 0);  // bits 1 and 2 together are fine here
   EXPECT_EQ(dst, (Bytes{'A', 'B', 'B'}));
+  to.curOffset = 9;  // past the capacity: nothing written, the length stays
+  EXPECT_EQ(normalize(h, from, to, 0, 0), NLSSM_E_DEST_TOO_SMALL);
+  EXPECT_EQ(to.length, 3u);
   to.capacity = 0;
   EXPECT_EQ(normalize(h, from, to, 0, 0), NLSSM_E_DEST_TOO_SMALL);
   int64_t written = -1;
@@ -251,6 +254,9 @@ TEST(Normalize, GenericMembersCopyThenMapThroughTheHandle) {
   to.length = 0;
   EXPECT_EQ(normalize(h, from, to, 0, kToUpper), NLSSM_E_DEST_TOO_SMALL);
   EXPECT_EQ(dst, (Bytes{0, 'A', 0, 'B'}));
+  EXPECT_EQ(to.length, 4u);
+  NLSString atEnd = over(src, 6);  // nothing left to copy, whatever the count
+  EXPECT_EQ(normalize(h, atEnd, to, 1, 0), 0);
   EXPECT_EQ(to.length, 4u);
   EXPECT_EQ(normalize(h, from, to, 0, 3), NLSSM_E_BAD_OPTIONS);
   EXPECT_EQ(normalize(h, from, to, 0, 9), NLSSM_E_BAD_OPTIONS);
