@@ -64,38 +64,35 @@ void set_bytes(benchmark::State &state) {
   state.SetBytesProcessed(static_cast<int64_t>(state.iterations()) * state.range(0));
 }
 
-void Module(benchmark::State &state, Case c) {
+// Upper-cases the sample in place with `run` (handle, bytes, length).
+template <typename Run>
+void in_place(benchmark::State &state, Case c, Run run) {
   const NLSSMHandle *h = handle(c.encoding);
   std::vector<uint8_t> text = sample_sbcs(c.icu, static_cast<size_t>(state.range(0)));
-  const auto upper = reinterpret_cast<UpperS>(h->NLSStringUpperS);
   for (auto _ : state) {
-    upper(h, text.data(), static_cast<int64_t>(text.size()), 0);
+    run(h, text.data(), static_cast<int64_t>(text.size()));
     benchmark::ClobberMemory();
   }
   set_bytes(state);
 }
 
+void Module(benchmark::State &state, Case c) {
+  in_place(state, c, [](const NLSSMHandle *h, uint8_t *p, int64_t n) {
+    reinterpret_cast<UpperS>(h->NLSStringUpperS)(h, p, n, 0);
+  });
+}
+
 void TableLoop(benchmark::State &state, Case c) {
-  const NLSSMHandle *h = handle(c.encoding);
-  std::vector<uint8_t> text = sample_sbcs(c.icu, static_cast<size_t>(state.range(0)));
-  for (auto _ : state) {
-    nlssm::casecmp::map_bytes_scalar(h->upperTable, text.data(), text.data(),
-                                     static_cast<int64_t>(text.size()));
-    benchmark::ClobberMemory();
-  }
-  set_bytes(state);
+  in_place(state, c, [](const NLSSMHandle *h, uint8_t *p, int64_t n) {
+    nlssm::casecmp::map_bytes_scalar(h->upperTable, p, p, n);
+  });
 }
 
 // The AVX2 kernel on its own, for processors without AVX-512 byte permutes.
 void Avx2(benchmark::State &state, Case c) {
-  const NLSSMHandle *h = handle(c.encoding);
-  std::vector<uint8_t> text = sample_sbcs(c.icu, static_cast<size_t>(state.range(0)));
-  for (auto _ : state) {
-    nlssm::casecmp::map_bytes(nlssm::casecmp::MapIsa::kAvx2, h->upperTable, text.data(),
-                              text.data(), static_cast<int64_t>(text.size()));
-    benchmark::ClobberMemory();
-  }
-  set_bytes(state);
+  in_place(state, c, [](const NLSSMHandle *h, uint8_t *p, int64_t n) {
+    nlssm::casecmp::map_bytes(nlssm::casecmp::MapIsa::kAvx2, h->upperTable, p, p, n);
+  });
 }
 
 void Memcpy(benchmark::State &state) {

@@ -12,7 +12,7 @@
 #include <cstring>
 #include <memory>
 
-#include "catalogue/catalogue.hpp"
+#include "module/encoding_tables.hpp"
 #include "module/operation_table.hpp"
 
 namespace {
@@ -70,15 +70,11 @@ struct Handles {
     for (size_t i = 0; i < std::size(kEncodings); ++i) {
       const Encoding &e = kEncodings[i];
       NLSSMHandle &x = h[i];
-      const nlssm::catalogue::TrantabRow &row = nlssm::catalogue::sm_trantab[e.number];
       x.owner = owner_words;
       x.encodingNumber = static_cast<uint32_t>(e.number);
       x.encodingClass = e.cls;
       x.unitWidth = e.unitWidth;
-      x.lowerTable = row.lower;
-      x.upperTable = row.upper;
-      x.dbcsTable = row.dbcs;
-      x.dbcsTableCount = row.dbcsCount;
+      nlssm::module::attach_encoding_tables(x);
       x.shiftLength = 1;
       x.charRanges = ranges;
       for (int r = 0; r < 2; ++r)
