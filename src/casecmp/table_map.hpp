@@ -53,6 +53,7 @@ namespace detail {
 // pieces only and answers 0 when the plan has none usable.
 int64_t map_blocks_sse2(const MapPlan &plan, const uint8_t *src, uint8_t *dst, int64_t n);
 int64_t map_blocks_avx2(const MapPlan &plan, const uint8_t *src, uint8_t *dst, int64_t n);
+// dst must be 64-byte aligned.
 int64_t map_blocks_avx512(const uint8_t *table, const uint8_t *src, uint8_t *dst, int64_t n);
 }  // namespace detail
 
