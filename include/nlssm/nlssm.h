@@ -1052,6 +1052,279 @@ NLSSM_API int64_t qvzsu8Find(const uint8_t *text, int64_t byteLength, const uint
                              int64_t patternLength);
 
 /* ---- Case mapping and normalization --------------------------------------- */
+/* NLSStringLower and NLSStringUpper map text to lower or upper case in place
+ * and return a status: 0 (also when there is nothing to do) or one of:
+ * NLSSM_E_BAD_OPTIONS (options above 7: UTF-EBCDIC, EUC-TW and GB18030
+ * members), NLSSM_E_NULL_ARGUMENT (null descriptor, or null buffer with a
+ * non-zero length). Options: bit 4 also maps double-byte characters through
+ * the handle's double-byte case table (multi-byte members); the other bits do
+ * nothing here.
+ * - plain form: from the descriptor's current character, at most `count`
+ *   characters (0 or negative: to `length`); nothing for an empty text or
+ *   no current character;
+ * - S form: the whole buffer of `byteLength` bytes (0 or negative: nothing);
+ * - C form: exactly `count` characters from the start of the buffer (0 or
+ *   negative: nothing); no byte limit is checked, so the caller vouches for
+ *   the characters (single byte: `count` bytes).
+ * Single-byte text goes through the case table; byte-table multi-byte text
+ * through it for single bytes; Unicode text through the host's
+ * character-information query. UTF-8 members keep the text's byte length: a
+ * shorter mapping moves the rest down and blanks (0x20) the freed bytes at
+ * the end (not in the C form); a longer one moves it up, and a character
+ * whose mapping would run past the end of the text ends the walk. A byte
+ * sequence that does not decode ends the walk with status 0. UTF-EBCDIC
+ * members map in place, the new form's length being the step; a mapping
+ * that would run past the end leaves its character; NLSStringUpper_UTFE
+ * ignores the count. */
+NLSSM_API int64_t NLSStringLower_SBCS(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_SBCS(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                               int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, NLSString *string,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_WCS2L(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS2L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_WCS2L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringLower_WCS2B(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS2B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_WCS2B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringLower_WCS4L(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS4L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_WCS4L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringLower_WCS4B(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS4B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_WCS4B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringLower_UTF8(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_UTF8(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLower_UTFE(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_UTFE(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_SBCS(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_SBCS(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                               int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, NLSString *string,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_WCS2L(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS2L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_WCS2L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringUpper_WCS2B(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS2B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_WCS2B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringUpper_WCS4L(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS4L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_WCS4L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringUpper_WCS4B(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS4B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_WCS4B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringUpper_UTF8(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_UTF8(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpper_UTFE(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_UTFE(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+
+/* NLSStringNormalize copies the source (from its current character, at most
+ * `count` characters, 0 = all) into the destination at its current offset
+ * (clamped to 0), mapped to upper case with option bit 2, else to lower case;
+ * option bit 4 maps double-byte characters too. Statuses: NLSSM_E_DEST_TOO_SMALL
+ * (capacity 0, or the copy was cut to the room: the part that fits is
+ * written and mapped), NLSSM_E_BAD_OPTIONS, NLSSM_E_NULL_ARGUMENT (null
+ * descriptor or buffer). Member differences:
+ * - _SBCS: grows the destination's length to cover the copy;
+ * - _MBCS_nonmodal: character by character while they fit; never reports
+ *   truncation and leaves the destination's length;
+ * - _MBCS_modal: nothing for an empty source or destination (length 0); first
+ *   brings the destination into the source's shift mode, copies the shift
+ *   sequences through, and sets the destination's length to the end of the
+ *   copy;
+ * - _WCS2L/B, _WCS4L/B, _UTFE, _MBCS_nonmodal_EUC_JP/_EUC_TW/_GB18030: refuse
+ *   options above 7 or with bits 1 and 2 both set (EUC-JP: any of bits 1, 2
+ *   and 4); copy, reposition the destination on its current character, then
+ *   run the handle's NLSStringUpper or NLSStringLower on it;
+ * - _UTF8: checks the options and runs the handle's NLSStringUpper or
+ *   NLSStringLower on the destination; the source is not read. */
+NLSSM_API int64_t NLSStringNormalize_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                          NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                   const NLSString *source, NLSString *destination,
+                                                   int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_modal(const NLSSMHandle *handle, const NLSString *source,
+                                                NLSString *destination, int64_t count,
+                                                uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_WCS2L(const NLSSMHandle *handle, const NLSString *source,
+                                           NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_WCS2B(const NLSSMHandle *handle, const NLSString *source,
+                                           NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_WCS4L(const NLSSMHandle *handle, const NLSString *source,
+                                           NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_WCS4B(const NLSSMHandle *handle, const NLSString *source,
+                                           NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_UTFE(const NLSSMHandle *handle, const NLSString *source,
+                                          NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                          const NLSString *source,
+                                                          NLSString *destination, int64_t count,
+                                                          uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                          const NLSString *source,
+                                                          NLSString *destination, int64_t count,
+                                                          uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                           const NLSString *source,
+                                                           NLSString *destination, int64_t count,
+                                                           uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                          NLSString *destination, int64_t count, uint32_t options);
+/* NLSStringNormalizeS maps n = min(sourceBytes, capacity) bytes of the source
+ * into the destination (they must not overlap unless equal) and stores n
+ * through `written` (may be null); NLSSM_E_DEST_TOO_SMALL when the capacity is
+ * below the source length. _MBCS_modal starts single-byte, follows the
+ * source's shift sequences without copying them and stores nothing; a
+ * non-modal lead byte in the last position is copied unchanged. The generic
+ * members check options as above, copy, then run the handle's
+ * NLSStringUpperS or NLSStringLowerS on the n destination bytes. _UTF8 runs
+ * NLSStringUpperS or NLSStringLowerS on the destination over the source
+ * length (kept within the capacity), without copying, and stores the source
+ * length. */
+NLSSM_API int64_t NLSStringNormalizeS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceBytes, uint8_t *destination,
+                                           int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                    const uint8_t *source, int64_t sourceBytes,
+                                                    uint8_t *destination, int64_t capacity,
+                                                    int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                                 int64_t sourceBytes, uint8_t *destination,
+                                                 int64_t capacity, int64_t *written,
+                                                 uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_WCS2L(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_WCS2B(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_WCS4L(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_WCS4B(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_UTFE(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceBytes, uint8_t *destination,
+                                           int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                           const uint8_t *source,
+                                                           int64_t sourceBytes,
+                                                           uint8_t *destination, int64_t capacity,
+                                                           int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                           const uint8_t *source,
+                                                           int64_t sourceBytes,
+                                                           uint8_t *destination, int64_t capacity,
+                                                           int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                            const uint8_t *source,
+                                                            int64_t sourceBytes,
+                                                            uint8_t *destination, int64_t capacity,
+                                                            int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceBytes, uint8_t *destination,
+                                           int64_t capacity, int64_t *written, uint32_t options);
+
 
 /* ---- Equality, inequality and ordering comparison ------------------------- */
 /* Equality (slots 10, 52, 105). 1 when equal, else 0; every failure (a null
@@ -2733,5 +3006,106 @@ NLSSM_API int64_t NLSStringFromDouble_fromQVChar(const NLSSMHandle *handle, void
                                                  int64_t capacity, int32_t *written);
 
 /* ---- Bidirectional text --------------------------------------------------- */
+/* Base direction: *direction is set to 0 (left-to-right) first and becomes 1
+ * (right-to-left) when the first character of category L (0), R (3) or AL (4)
+ * is R or AL; other categories, and characters the host has no category for,
+ * are passed over. `length` is in bytes. A null `direction` gives
+ * NLSSM_E_NULL_ARGUMENT; a null text with a positive length too.
+ * SBCS: bytes through the handle's bidiTable (none: left-to-right).
+ * UTF-8: every character takes the length the text's first byte announces
+ * (00-7F 1, C0-DF 2, E0-EF 3, F0-F7 4, F8-FB 5, any other 6), its value built
+ * from those bytes and asked of the host; a character that would reach more
+ * than one byte past `length` gives NLSSM_E_BAD_CHARACTER, so up to one byte
+ * past `length` is read. UTFE and MBCS: always left-to-right, status 0.
+ * WCS2: 16-bit units, little-endian for encoding 25, else big-endian; a high
+ * surrogate goes to the host with the unit after it as (high << 16) | low,
+ * read even past `length` (2 bytes); a high surrogate without a low one, or
+ * a lone low one, gives NLSSM_E_BAD_CHARACTER. An odd last byte is ignored.
+ * WCS4: 32-bit units, little-endian for encoding 27, else big-endian; bytes
+ * after the last whole unit are ignored. */
+NLSSM_API int64_t NLSGetBaseDirection_SBCS(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+NLSSM_API int64_t NLSGetBaseDirection_UTF8(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+NLSSM_API int64_t NLSGetBaseDirection_UTFE(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+NLSSM_API int64_t NLSGetBaseDirection_WCS2(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+NLSSM_API int64_t NLSGetBaseDirection_WCS4(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+NLSSM_API int64_t NLSGetBaseDirection_MBCS(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+
+/* Reordering of one line, after the Unicode Bidirectional Algorithm (UAX #9:
+ * paragraph level, explicit embeddings, overrides and isolates, weak and
+ * neutral types, paired brackets, implicit levels, trailing white space,
+ * reversal of levels, mirroring).
+ *   NLSVisualOrderFormat: text in reading (logical) order -> display order,
+ *     left to right; characters at right-to-left levels that have a mirror
+ *     image are shown mirrored.
+ *   NLSLogicalOrderFormat: a displayed line -> a reading order that
+ *     displays as that line (with the same paragraph level). The first
+ *     attempt is the line resolved as if it were in reading order with its
+ *     runs reversed (and mirrored) back; while an attempt does not display as
+ *     the line, the next undoes the display order it resolved to, up to 8
+ *     attempts in all. When none does, the first attempt is the result (status
+ *     0 all the same): a line may have no reading order that displays as it.
+ *     Words of either direction with blanks between them come back exactly
+ *     as they were written; in general a line can come from several reading
+ *     orders, and this gives one of them.
+ * (handle, source, source bytes, destination, capacity in bytes, out bytes
+ * written (may be null), direction) -> status.
+ * *direction in: 0 left-to-right, 1 right-to-left, any other value: from the
+ * text's first strong character outside isolates (left-to-right when it has
+ * none; for NLSLogicalOrderFormat the displayed line's first, from the
+ * left). Out: the paragraph level used, 0 or 1 (of the first paragraph).
+ * A paragraph separator ends a paragraph: each is resolved and reordered on
+ * its own, in place. Embedding and override controls and boundary neutrals
+ * stay in the text, placed with the character before them.
+ * Characters: SBCS bytes with the categories of the reordering table of the
+ * handle's bidiTable (a byte without a category counts as ON; the page's
+ * ( ) [ ] { } are paired brackets, its eight bracket-like characters
+ * mirror); without a table every byte is left-to-right and the text comes
+ * back unchanged. UTF-8
+ * (encoding 20) or UTF-EBCDIC (other class-1 encodings), UTF-16 (WCS2;
+ * big-endian for encoding 24, else little-endian) and UTF-32 (WCS4;
+ * big-endian for encoding 26, else little-endian) with the host's categories
+ * and the Unicode paired brackets and mirror images. Ill-formed input (a bad
+ * sequence, a lone surrogate, a value above U+10FFFF) becomes U+FFFD, class
+ * ON, with NLSSM_E_ILL_FORMED; input ending inside a character likewise with
+ * NLSSM_E_TRUNCATED_SEQUENCE; the rest is still reordered.
+ * The output takes as many bytes as the input, save for replaced input and
+ * mirror images of another length. When it does not fit, the characters that
+ * fit (in output order, none split) are written and the result is
+ * NLSSM_E_DEST_TOO_SMALL; nothing is written past `capacity`. Negative
+ * lengths count as 0. Null handle or direction, or a null buffer with a
+ * positive length: NLSSM_E_NULL_ARGUMENT. The work area (about 70 bytes per
+ * character) comes from the handle's pool beyond 2 KiB: NLSSM_E_NO_MEMORY
+ * when the pool refuses, and for a text of 2 GiB or more. The source and
+ * destination must not overlap. */
+NLSSM_API int64_t NLSVisualOrderFormat_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                            int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSVisualOrderFormat_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                            int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSVisualOrderFormat_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                            int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSVisualOrderFormat_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                            int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSLogicalOrderFormat_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                             int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                             int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSLogicalOrderFormat_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                             int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                             int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSLogicalOrderFormat_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                             int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                             int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSLogicalOrderFormat_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                             int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                             int64_t *written, uint8_t *direction);
 
 #endif /* NLSSM_NLSSM_H */
