@@ -51,7 +51,7 @@ ENCODINGS = [
     lambda t: encode("gb18030", t),       # 205
 ]
 
-HANDLE_TARGETS = ["cursor", "search", "compare", "edit", "editmove", "translit", "numeric"]
+HANDLE_TARGETS = ["cursor", "search", "compare", "edit", "editmove", "translit", "numeric", "bidi"]
 
 
 def write(family, seeds):

@@ -61,6 +61,15 @@ inline Host &host() {
   return *h;
 }
 
+// A handle for one more encoding, made before any input runs; the pool
+// accounting starts again from it.
+inline const NLSSMHandle *extra_handle(int encoding) {
+  NLSSMHandle *handle = nullptr;
+  FUZZ_CHECK(host().host->create_handle(encoding, &handle) == 0 && handle);
+  host().allocations = host().host->pools().counts().allocations;
+  return handle;
+}
+
 inline const NLSSMHandle *pick_handle(FuzzedDataProvider &in) {
   const size_t i = in.ConsumeIntegralInRange<size_t>(0, kEncodingCount - 1);
   current_encoding = kEncodings[i];
