@@ -32,6 +32,28 @@ inline constexpr std::array<Isa, 2> kAllIsas{Isa::sse2, Isa::avx2};
 bool supports(Isa isa) noexcept;
 const char *name(Isa isa) noexcept;
 
+// The data caches one core sees, in bytes. `llc` is the whole last level,
+// which the cores sharing it compete for; on a processor with two levels it
+// is the second.
+struct Caches {
+  int64_t l1d;
+  int64_t l2;
+  int64_t llc;
+  int64_t line;
+};
+
+// Read from the processor's cache descriptors, else from the C library;
+// levels neither reports get typical sizes. Detected once, when the module
+// is loaded.
+const Caches &caches() noexcept;
+
+// Block operations of at least this many bytes write with non-temporal
+// stores: their destination (and a copy's source besides) cannot stay in the
+// last-level cache, so storing through it would evict everything else and
+// first read every line it is about to replace.
+int64_t stream_copy_min() noexcept;
+int64_t stream_fill_min() noexcept;
+
 template <typename Table>
 struct Variant {
   Isa isa;

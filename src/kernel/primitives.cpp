@@ -85,10 +85,16 @@ int64_t skMemTNot(uint32_t value, const uint32_t *buffer, int64_t length) {
 }
 
 void skMemSet(uint8_t *buffer, uint8_t value, int64_t length) {
-  if (buffer != nullptr && length > 0) kernel::hot().mem_set(buffer, value, length);
+  if (buffer == nullptr || length <= 0) return;
+  const kernel::HotOps &ops = kernel::hot();
+  (length >= kernel::cpu::stream_fill_min() ? ops.mem_stream_set : ops.mem_set)(buffer, value,
+                                                                                length);
 }
 void skMemTSet(uint32_t *buffer, uint32_t value, int64_t length) {
-  if (buffer != nullptr && length > 0) kernel::hot().mem_tset(buffer, value, length);
+  if (buffer == nullptr || length <= 0) return;
+  const kernel::HotOps &ops = kernel::hot();
+  const bool stream = length >= kernel::cpu::stream_fill_min() / int64_t{sizeof(uint32_t)};
+  (stream ? ops.mem_stream_tset : ops.mem_tset)(buffer, value, length);
 }
 
 int64_t skMemCmp(const uint8_t *a, const uint8_t *b, int64_t length) {
@@ -115,11 +121,12 @@ int64_t skWMemCmp(const uint32_t *a, const uint32_t *b, int64_t length) {
 
 void *skMemCpy(const void *source, void *destination, int64_t length) {
   if (source == nullptr || destination == nullptr || length <= 0) return destination;
-  if (length > kBlockCopyMin && disjoint(source, destination, length))
-    std::memcpy(destination, source, static_cast<size_t>(length));
+  const auto *s = static_cast<const uint8_t *>(source);
+  auto *d = static_cast<uint8_t *>(destination);
+  if (length > kBlockCopyMin && disjoint(s, d, length))
+    kernel::copy_disjoint(d, s, length);
   else
-    copy_pairs_up(static_cast<const uint8_t *>(source), static_cast<uint8_t *>(destination),
-                  length);
+    copy_pairs_up(s, d, length);
   return destination;
 }
 
@@ -128,13 +135,17 @@ void *skMemSCpy(const void *source, void *destination, int64_t length) {
     return destination;
   const auto *s = static_cast<const uint8_t *>(source);
   auto *d = static_cast<uint8_t *>(destination);
-  if (length > kBlockCopyMin)
-    disjoint(s, d, length) ? std::memcpy(d, s, static_cast<size_t>(length))
-                           : std::memmove(d, s, static_cast<size_t>(length));
-  else if (reinterpret_cast<uintptr_t>(d) < reinterpret_cast<uintptr_t>(s))
+  const bool upwards = reinterpret_cast<uintptr_t>(d) < reinterpret_cast<uintptr_t>(s);
+  if (length > kBlockCopyMin) {
+    if (disjoint(s, d, length))
+      kernel::copy_disjoint(d, s, length);
+    else
+      (upwards ? kernel::hot().copy_up : kernel::hot().copy_down)(d, s, length);
+  } else if (upwards) {
     copy_pairs_up(s, d, length);
-  else
+  } else {
     copy_pairs_down(s, d, length);
+  }
   return destination;
 }
 
