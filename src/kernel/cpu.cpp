@@ -6,7 +6,7 @@
 namespace kernel::cpu {
 namespace {
 
-enum Feature : uint32_t { kAvx2 = 1u << 0 };
+enum Feature : uint32_t { kAvx2 = 1u << 0, kFastStrings = 1u << 1 };
 
 struct Processor {
   uint32_t features;
@@ -20,6 +20,10 @@ uint32_t detect_features() noexcept {
   uint32_t features = 0;
   // The AVX2 paths also count bits with popcnt, which every AVX2 processor has.
   if (__builtin_cpu_supports("avx2") && __builtin_cpu_supports("popcnt")) features |= kAvx2;
+  // Leaf 7, EBX bit 9: enhanced rep movsb/stosb.
+  unsigned a, b, c, d;
+  if (__get_cpuid_count(7, 0, &a, &b, &c, &d) != 0 && (b & (1u << 9)) != 0)
+    features |= kFastStrings;
   return features;
 }
 
@@ -116,8 +120,19 @@ const Caches &caches() noexcept {
   return processor().caches;
 }
 
-// A copy holds its source and its destination: together they overflow the
-// last level at half its size. A fill only writes.
+bool fast_string_ops() noexcept {
+  return (processor().features & kFastStrings) != 0;
+}
+
+// A copy holds its source and its destination: together they overflow a
+// cache level at half its size. A fill only writes.
+int64_t string_copy_min() noexcept {
+  return fast_string_ops() ? caches().l1d / 2 : INT64_MAX;
+}
+int64_t string_fill_min() noexcept {
+  return fast_string_ops() ? caches().l2 : INT64_MAX;
+}
+
 int64_t stream_copy_min() noexcept {
   return caches().llc / 2;
 }

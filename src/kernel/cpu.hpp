@@ -47,6 +47,17 @@ struct Caches {
 // is loaded.
 const Caches &caches() noexcept;
 
+// True when the processor's string instructions (rep movsb, rep stosb) move
+// whole cache lines at a time (enhanced rep movsb/stosb).
+bool fast_string_ops() noexcept;
+
+// Block operations from these sizes on use the string instructions, where
+// the processor has fast ones (else never): a copy once its source and
+// destination no longer fit the first-level cache together, a fill once it
+// no longer fits the second level. Below, the vector loops are faster.
+int64_t string_copy_min() noexcept;
+int64_t string_fill_min() noexcept;
+
 // Block operations of at least this many bytes write with non-temporal
 // stores: their destination (and a copy's source besides) cannot stay in the
 // last-level cache, so storing through it would evict everything else and

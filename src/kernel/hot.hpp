@@ -65,11 +65,42 @@ inline const HotOps &hot() noexcept {
   return hot_ops.get();
 }
 
-// Copies between disjoint ranges, around the caches when the block is too
-// large for them.
+// The processor's string instructions (the direction flag is clear at every
+// call by the calling convention, so they work upwards).
+inline void string_copy(uint8_t *destination, const uint8_t *source, int64_t length) noexcept {
+  asm volatile("rep movsb" : "+D"(destination), "+S"(source), "+c"(length) : : "memory");
+}
+inline void string_fill(uint8_t *buffer, uint8_t value, int64_t length) noexcept {
+  asm volatile("rep stosb" : "+D"(buffer), "+c"(length) : "a"(value) : "memory");
+}
+
+// Copies between disjoint ranges with the routine that is fastest for the
+// block's size on this processor's caches.
 inline void copy_disjoint(uint8_t *destination, const uint8_t *source, int64_t length) {
-  const HotOps &ops = hot();
-  (length >= cpu::stream_copy_min() ? ops.copy_stream : ops.copy_up)(destination, source, length);
+  if (length >= cpu::stream_copy_min())
+    hot().copy_stream(destination, source, length);
+  else if (length >= cpu::string_copy_min())
+    string_copy(destination, source, length);
+  else
+    hot().copy_up(destination, source, length);
+}
+
+// The same for byte fills.
+inline void fill_bytes(uint8_t *buffer, uint8_t value, int64_t length) {
+  if (length >= cpu::stream_fill_min())
+    hot().mem_stream_set(buffer, value, length);
+  else if (length >= cpu::string_fill_min())
+    string_fill(buffer, value, length);
+  else
+    hot().mem_set(buffer, value, length);
+}
+
+// 32-bit fills have no string instruction that repeats a whole unit.
+inline void fill_units(uint32_t *buffer, uint32_t value, int64_t count) {
+  if (count >= cpu::stream_fill_min() / int64_t{sizeof(uint32_t)})
+    hot().mem_stream_tset(buffer, value, count);
+  else
+    hot().mem_tset(buffer, value, count);
 }
 
 }  // namespace kernel

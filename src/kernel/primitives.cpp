@@ -85,16 +85,10 @@ int64_t skMemTNot(uint32_t value, const uint32_t *buffer, int64_t length) {
 }
 
 void skMemSet(uint8_t *buffer, uint8_t value, int64_t length) {
-  if (buffer == nullptr || length <= 0) return;
-  const kernel::HotOps &ops = kernel::hot();
-  (length >= kernel::cpu::stream_fill_min() ? ops.mem_stream_set : ops.mem_set)(buffer, value,
-                                                                                length);
+  if (buffer != nullptr && length > 0) kernel::fill_bytes(buffer, value, length);
 }
 void skMemTSet(uint32_t *buffer, uint32_t value, int64_t length) {
-  if (buffer == nullptr || length <= 0) return;
-  const kernel::HotOps &ops = kernel::hot();
-  const bool stream = length >= kernel::cpu::stream_fill_min() / int64_t{sizeof(uint32_t)};
-  (stream ? ops.mem_stream_tset : ops.mem_tset)(buffer, value, length);
+  if (buffer != nullptr && length > 0) kernel::fill_units(buffer, value, length);
 }
 
 int64_t skMemCmp(const uint8_t *a, const uint8_t *b, int64_t length) {

@@ -26,6 +26,10 @@ struct CopyPath {
   CopyFn up, down, stream;
 };
 
+void PrintTo(const CopyPath &path, std::ostream *out) {
+  *out << path.name;
+}
+
 std::vector<CopyPath> copy_paths() {
   std::vector<CopyPath> out;
   for (const auto &variant : kernel::hot_ops.variants())
@@ -114,30 +118,36 @@ TEST_P(BlockCopyTest, LargeBlocks) {
 INSTANTIATE_TEST_SUITE_P(Kernel, BlockCopyTest, testing::ValuesIn(copy_paths()),
                          [](const auto &info) { return info.param.name; });
 
-// The exported copy and fills past the sizes at which they switch to
-// non-temporal stores.
-TEST(BlockCopy, ExportedFunctionsBeyondTheCaches) {
-  const int64_t n = kernel::cpu::stream_fill_min() + 4099;
-  if (n > (int64_t{1} << 30)) GTEST_SKIP() << "last-level cache too large to exceed here";
-  std::vector<uint8_t> source(n + 64), destination(n + 64, 0xee);
+// The exported copy and fills on both sides of every size at which they
+// switch routine (string instructions, non-temporal stores).
+TEST(BlockCopy, ExportedFunctionsAroundEverySwitch) {
+  std::vector<int64_t> sizes;
+  for (int64_t size : {kernel::cpu::string_copy_min(), kernel::cpu::string_fill_min(),
+                       kernel::cpu::stream_copy_min(), kernel::cpu::stream_fill_min()})
+    if (size < (int64_t{1} << 30)) sizes.insert(sizes.end(), {size - 1, size + 4099});
+  const int64_t largest = *std::max_element(sizes.begin(), sizes.end());
+  std::vector<uint8_t> source(largest + 64), destination(largest + 64);
   for (size_t i = 0; i < source.size(); ++i) source[i] = static_cast<uint8_t>(i * 131 + (i >> 12));
-  const int64_t copied = kernel::cpu::stream_copy_min() + 1001;
-  ASSERT_EQ(skMemCpy(source.data() + 3, destination.data() + 1, copied), destination.data() + 1);
-  EXPECT_EQ(destination[0], 0xee);
-  EXPECT_EQ(std::memcmp(destination.data() + 1, source.data() + 3, copied), 0);
-  EXPECT_EQ(destination[copied + 1], 0xee);
+  std::vector<uint32_t> units(largest / 4 + 2);
+  for (int64_t n : sizes) {
+    std::fill(destination.begin(), destination.end(), 0xee);
+    ASSERT_EQ(skMemCpy(source.data() + 3, destination.data() + 1, n), destination.data() + 1);
+    EXPECT_EQ(destination[0], 0xee);
+    EXPECT_EQ(std::memcmp(destination.data() + 1, source.data() + 3, n), 0) << n;
+    EXPECT_EQ(destination[n + 1], 0xee);
 
-  std::fill(destination.begin(), destination.end(), 0xee);
-  skMemSet(destination.data() + 5, 0x3c, n);
-  EXPECT_EQ(destination[4], 0xee);
-  EXPECT_EQ(kernel::scalar::find<false>(destination.data() + 5, n, uint8_t{0x3c}), -1);
-  EXPECT_EQ(destination[n + 5], 0xee);
+    std::fill(destination.begin(), destination.end(), 0xee);
+    skMemSet(destination.data() + 5, 0x3c, n);
+    EXPECT_EQ(destination[4], 0xee);
+    EXPECT_EQ(kernel::scalar::find<false>(destination.data() + 5, n, uint8_t{0x3c}), -1) << n;
+    EXPECT_EQ(destination[n + 5], 0xee);
 
-  std::vector<uint32_t> units(n / 4 + 2, 7);
-  skMemTSet(units.data() + 1, 0xfeedf00d, n / 4);
-  EXPECT_EQ(units[0], 7u);
-  EXPECT_EQ(kernel::scalar::find<false>(units.data() + 1, n / 4, 0xfeedf00du), -1);
-  EXPECT_EQ(units[n / 4 + 1], 7u);
+    std::fill(units.begin(), units.end(), 7);
+    skMemTSet(units.data() + 1, 0xfeedf00d, n / 4);
+    EXPECT_EQ(units[0], 7u);
+    EXPECT_EQ(kernel::scalar::find<false>(units.data() + 1, n / 4, 0xfeedf00du), -1) << n;
+    EXPECT_EQ(units[n / 4 + 1], 7u);
+  }
 }
 
 // Sizes in the form the kernel's sysfs cache directory gives them ("48K").
