@@ -72,6 +72,21 @@ void Set(benchmark::State &state) {
   state.SetBytesProcessed(state.iterations() * n);
 }
 
+// Compares two equal buffers, so the whole length is read.
+template <bool Kernel>
+void Compare(benchmark::State &state) {
+  const int64_t n = state.range(0);
+  Buffer a(n, 'c'), b(n + 1, 'c');
+  for (auto _ : state) {
+    if constexpr (Kernel)
+      benchmark::DoNotOptimize(skMemCmp(a.bytes.get(), b.bytes.get() + 1, n));
+    else
+      benchmark::DoNotOptimize(
+          std::memcmp(a.bytes.get(), b.bytes.get() + 1, static_cast<size_t>(n)));
+  }
+  state.SetBytesProcessed(state.iterations() * n);
+}
+
 // Copies between two buffers.
 template <bool Kernel>
 void Copy(benchmark::State &state) {
@@ -141,6 +156,7 @@ const bool kBlockBenchmarks = [] {
 
 NLSSM_BENCH_PAIR(Scan, "skMemScan", "memchr");
 NLSSM_BENCH_PAIR(Upper, "skStrUp", "byte_loop_upper");
+NLSSM_BENCH_PAIR(Compare, "skMemCmp", "memcmp");
 
 }  // namespace
 

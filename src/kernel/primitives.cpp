@@ -13,6 +13,10 @@ namespace {
 // cost less than its call.
 constexpr int64_t kBlockCopyMin = 96;
 
+// Shorter compares are done eight bytes per step before the vector loop
+// would have been set up.
+constexpr int64_t kVectorCompareMin = 64;
+
 bool disjoint(const void *a, const void *b, int64_t n) {
   const auto x = reinterpret_cast<uintptr_t>(a), y = reinterpret_cast<uintptr_t>(b);
   const auto len = static_cast<uintptr_t>(n);
@@ -94,9 +98,13 @@ void skMemTSet(uint32_t *buffer, uint32_t value, int64_t length) {
 int64_t skMemCmp(const uint8_t *a, const uint8_t *b, int64_t length) {
   if (length <= 0) return 0;
   if (int64_t order = kernel::scalar::null_order(a, b); order != 2) return order;
+  if (length >= kVectorCompareMin) {
+    const int64_t at = kernel::hot().mem_mismatch(a, b, length);
+    return at == length ? 0 : a[at] > b[at] ? 1 : -1;
+  }
+  int64_t i = 0;
   // Eight bytes per step; the lowest differing byte of the little-endian
   // words is the first differing byte of the buffers.
-  int64_t i = 0;
   for (; i + 8 <= length; i += 8) {
     uint64_t x, y;
     std::memcpy(&x, a + i, 8);

@@ -181,12 +181,19 @@ int64_t find(const T *p, int64_t n, T value) {
 // Offset of the first differing byte of two ranges, or n. The two ranges
 // rarely share an alignment, so `a` is aligned and `b` read unaligned; four
 // registers are tested at a time while they agree, which keeps long equal
-// ranges at the speed of a plain block compare.
+// ranges at the speed of a plain block compare. The bytes before a's first
+// aligned address and after its last are covered by one unaligned register
+// each, overlapping the aligned ones.
 template <class V>
 int64_t mismatch(const uint8_t *a, const uint8_t *b, int64_t n) {
   constexpr int64_t step = V::kBytes;
+  if (n < step) return scalar::mem_mismatch(a, b, n);
+  // Bits of the bytes that differ in the register at `at`.
+  auto differ = [a, b](int64_t at) {
+    return V::mask(V::template eq<uint8_t>(V::loadu(a + at), V::loadu(b + at))) ^ V::kAllBytes;
+  };
+  if (const auto d = differ(0); d != 0) return __builtin_ctz(d);
   int64_t i = head_elements<V>(a, n);
-  if (const int64_t r = scalar::mem_mismatch(a, b, i); r < i) return r;
   for (; i + 4 * step <= n; i += 4 * step) {
     const auto e0 = V::template eq<uint8_t>(V::load(a + i), V::loadu(b + i));
     const auto e1 = V::template eq<uint8_t>(V::load(a + i + step), V::loadu(b + i + step));
@@ -194,12 +201,11 @@ int64_t mismatch(const uint8_t *a, const uint8_t *b, int64_t n) {
     const auto e3 = V::template eq<uint8_t>(V::load(a + i + 3 * step), V::loadu(b + i + 3 * step));
     if (V::mask(V::both(V::both(e0, e1), V::both(e2, e3))) != V::kAllBytes) break;
   }
-  for (; i + step <= n; i += step) {
-    const typename V::Mask differ =
-        V::mask(V::template eq<uint8_t>(V::load(a + i), V::loadu(b + i))) ^ V::kAllBytes;
-    if (differ != 0) return i + __builtin_ctz(differ);
-  }
-  return i + scalar::mem_mismatch(a + i, b + i, n - i);
+  for (; i + step <= n; i += step)
+    if (const auto d = differ(i); d != 0) return i + __builtin_ctz(d);
+  if (i < n)
+    if (const auto d = differ(n - step); d != 0) return n - step + __builtin_ctz(d);
+  return n;
 }
 
 }  // namespace kernel::simd

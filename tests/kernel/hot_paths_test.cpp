@@ -114,6 +114,32 @@ TEST_P(HotPathTest, ScansFindTheFirstHitInsideTheRange) {
       0x80200020);
 }
 
+// The first difference at every length and alignment, with differing bytes
+// just outside the range so that reading past it gives a wrong answer.
+TEST_P(HotPathTest, MismatchFindsTheFirstDifferenceInsideTheRange) {
+  const auto &ops = GetParam().ops;
+  alignas(64) std::array<uint8_t, 64 + kMaxLength + 64> a, b;
+  std::mt19937 rng(77);
+  for (int64_t n = 0; n <= kMaxLength; ++n) {
+    for (int64_t shift = 0; shift < 64; ++shift) {
+      for (auto &x : a) x = static_cast<uint8_t>(rng());
+      for (auto &x : b) x = static_cast<uint8_t>(rng());
+      uint8_t *pa = a.data() + shift, *pb = b.data() + 1 + (shift * 5 + n) % 63;
+      std::copy(pa, pa + n, pb);
+      pb[n] = static_cast<uint8_t>(pa[n] ^ 1);
+      ASSERT_EQ(ops.mem_mismatch(pa, pb, n), n) << "length " << n << ", shift " << shift;
+      if (n == 0) continue;
+      for (int64_t at : {int64_t{0}, n - 1, n / 2, (n * 13 + shift) % n}) {
+        pb[at] ^= 0x80;
+        if (at + 1 < n) pb[at + 1] ^= 0x01;  // later differences do not count
+        ASSERT_EQ(ops.mem_mismatch(pa, pb, n), at) << "length " << n << ", shift " << shift;
+        pb[at] ^= 0x80;
+        if (at + 1 < n) pb[at + 1] ^= 0x01;
+      }
+    }
+  }
+}
+
 INSTANTIATE_TEST_SUITE_P(Kernel, HotPathTest, testing::ValuesIn(paths()),
                          [](const auto &info) { return info.param.name; });
 
