@@ -305,4 +305,32 @@ TEST_F(OperationSweep, LongLiteralListsAndSqueezeCharacterAnswerNoMemoryWhenRefu
   EXPECT_GE(refused, 1);
 }
 
+// Reordering a line works in an area of about 70 bytes per character, from
+// the pool beyond its 2 KiB on the stack.
+TEST_F(OperationSweep, LongLineReorderingAnswersNoMemoryWhenRefused) {
+  const NLSSMHandle *h = handle(NLSSM_ENC_UTF8);
+  const Bytes line = narrow("abc def ", 200);
+  using OrderFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, uint8_t *, int64_t,
+                              int64_t *, uint8_t *);
+  for (NLSSlot order : {h->NLSVisualOrderFormat, h->NLSLogicalOrderFormat}) {
+    Bytes out(line.size());
+    int64_t written = 0;
+    const int refused = sweep(
+        *host,
+        [&] {
+          uint8_t direction = 0;
+          written = 0;
+          return slot<OrderFn>(order)(h, line.data(), int64_t(line.size()), out.data(),
+                                      int64_t(out.size()), &written, &direction);
+        },
+        [&](int64_t r, bool refused) {
+          EXPECT_EQ(r, refused ? kNoMemory : NLSSM_OK);
+          if (!refused) {
+            EXPECT_EQ(out, line);  // left-to-right text keeps its order
+          }
+        });
+    EXPECT_GE(refused, 1);
+  }
+}
+
 }  // namespace
