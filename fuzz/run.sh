@@ -53,7 +53,7 @@ for target in "${targets[@]}"; do
   else
     grep -E '^stat::(number_of_executed_units|average_exec_per_sec|peak_rss_mb)' \
       "$build/$target.log" || true
-    grep -E '^#[0-9]+ *DONE' "$build/$target.log" | tail -n1 || true
+    grep -E '^#[0-9]+[[:space:]]+DONE' "$build/$target.log" | tail -n1 || true
   fi
   if [[ $keep == 1 && -d $seeds ]]; then
     # Merge: only inputs that add coverage join the committed corpus.
