@@ -176,9 +176,15 @@ std::vector<uint8_t> Session::convert(int64_t from, int64_t to,
 
 std::vector<uint8_t> Session::input(const NLSSMHandle *handle, const Arguments &args) {
   if (args.has("text")) {
+    // Verbs convert their words again for every record: keep the last few.
     const std::string &utf8 = args.options.at("text");
-    return convert(NLSSM_ENC_UTF8, handle->encodingNumber,
-                   std::vector<uint8_t>(utf8.begin(), utf8.end()));
+    const auto key = std::make_pair(static_cast<int64_t>(handle->encodingNumber), utf8);
+    const auto known = texts_.find(key);
+    if (known != texts_.end()) return known->second;
+    std::vector<uint8_t> text = convert(NLSSM_ENC_UTF8, handle->encodingNumber,
+                                        std::vector<uint8_t>(utf8.begin(), utf8.end()));
+    if (texts_.size() < 64 && utf8.size() < 4096) texts_.emplace(key, text);
+    return text;
   }
   if (args.has("hex")) return parse_hex(args.options.at("hex"));
   if (stream_ == nullptr) {
@@ -189,7 +195,9 @@ std::vector<uint8_t> Session::input(const NLSSMHandle *handle, const Arguments &
                                        file_.empty() ? "standard input" : file_);
   }
   took_ = true;
-  return stream_->next(handle);
+  std::vector<uint8_t> text = stream_->next(handle);
+  if (text.capacity() == 0) text.reserve(1);  // an empty line still has a buffer to point at
+  return text;
 }
 
 OutputForm Session::output_form(const Arguments &args) {

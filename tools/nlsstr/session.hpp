@@ -92,6 +92,7 @@ class Session {
   std::unique_ptr<nlssm::refhost::ReferenceHost> host_;
   std::map<std::string, const NLSSMHandle *> handles_;
   mutable std::map<std::pair<int64_t, int64_t>, void *> converters_;
+  std::map<std::pair<int64_t, std::string>, std::vector<uint8_t>> texts_;
   Split split_ = Split::kWhole;
   size_t record_bytes_ = 0;
   std::string file_;
