@@ -1,6 +1,7 @@
 #include "session.hpp"
 
 #include <nlssm/host.h>
+#include <nlssm/nlssm.hpp>
 
 #include <fcntl.h>
 #include <unistd.h>
@@ -8,10 +9,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
-#include <fstream>
 #include <iostream>
-#include <iterator>
-#include <sstream>
 
 namespace nlsstr {
 namespace {
@@ -49,25 +47,8 @@ std::vector<uint8_t> parse_hex(const std::string &text) {
 }  // namespace
 
 std::string status_name(int64_t status) {
-  static const std::map<int64_t, std::string> names = {
-      {NLSSM_E_NO_MEMORY, "NLSSM_E_NO_MEMORY"},
-      {NLSSM_E_UNSUPPORTED, "NLSSM_E_UNSUPPORTED"},
-      {NLSSM_E_DEST_TOO_SMALL, "NLSSM_E_DEST_TOO_SMALL"},
-      {NLSSM_E_ILL_FORMED, "NLSSM_E_ILL_FORMED"},
-      {NLSSM_E_ENCODING, "NLSSM_E_ENCODING"},
-      {NLSSM_E_NUMBER_DOES_NOT_FIT, "NLSSM_E_NUMBER_DOES_NOT_FIT"},
-      {NLSSM_E_NOT_A_NUMBER, "NLSSM_E_NOT_A_NUMBER"},
-      {NLSSM_E_INT_OVERFLOW, "NLSSM_E_INT_OVERFLOW"},
-      {NLSSM_E_TRUNCATED_SEQUENCE, "NLSSM_E_TRUNCATED_SEQUENCE"},
-      {NLSSM_E_NUMBER_TOO_LONG, "NLSSM_E_NUMBER_TOO_LONG"},
-      {NLSSM_E_NULL_ARGUMENT, "NLSSM_E_NULL_ARGUMENT"},
-      {NLSSM_E_BAD_CHARACTER, "NLSSM_E_BAD_CHARACTER"},
-      {NLSSM_E_BAD_OPTIONS, "NLSSM_E_BAD_OPTIONS"},
-      {NLSSM_E_BAD_ARGUMENT, "NLSSM_E_BAD_ARGUMENT"},
-      {NLSSM_E_BAD_ALIGNMENT, "NLSSM_E_BAD_ALIGNMENT"},
-  };
-  const auto found = names.find(status);
-  return found == names.end() ? std::string() : found->second;
+  if (status == 0 || status < 0 || status > UINT32_MAX) return {};
+  return nlssm::Status(static_cast<uint32_t>(status)).name();
 }
 
 void check(int64_t status, const std::string &what) {
