@@ -18,6 +18,13 @@ expect() {
 same() { [[ "$2" == "$3" ]] || fail "$1: expected [$2], got [$3]"; }
 # The text as raw bytes of an encoding.
 bytes() { "$nlsstr" substr "$1" --text "$2" --out raw 2>/dev/null; }
+# twice K: standard input repeated 2^K times.
+twice() {
+  local k
+  cat >"$work/twice"
+  for ((k = 0; k < $1; ++k)); do cat "$work/twice" "$work/twice" >"$work/twice.2" && mv "$work/twice.2" "$work/twice"; done
+  cat "$work/twice"
+}
 
 # Help for the tool and for every verb, and exit codes of the command line.
 expect 0 "$nlsstr" --help
@@ -55,6 +62,20 @@ record 5: 2 characters, 5 bytes
 record 6: 1 characters, 4 bytes
 record 7: 2 characters, 5 bytes" "$(cat "$work/out")"
 
+# Every other multi-byte form, records of 3 to 7 bytes: each record converts
+# whole, and the records put together are the input.
+for encoding in 24 25 26 27 134 135 161 205; do
+  wide='aé漢😀b𠀋ｶ€z'
+  ((encoding == 134 || encoding == 135)) && wide='aｶ漢字b表ｶz' # 表: trail byte 0x5C
+  bytes "$encoding" "$wide" >"$work/wide"
+  for n in 3 4 5 7; do
+    expect 0 "$nlsstr" substr "$encoding" --records "$n" --file "$work/wide" --out utf8
+    same "encoding $encoding, records of $n" "$wide" "$(tr -d '\n' <"$work/out")"
+    expect 0 "$nlsstr" substr "$encoding" --records "$n" --file "$work/wide" --out raw
+    cmp -s "$work/out" "$work/wide" || fail "encoding $encoding: records of $n do not put back together"
+  done
+done
+
 # Modal EBCDIC (code page 930) in records of 4 and 5 bytes: a record cut
 # inside a double-byte run is closed with shift-in and the next opened with
 # shift-out, so every record converts whole and they read as the input.
@@ -90,12 +111,20 @@ record 2: 1 characters, 2 bytes" "$(cat "$work/out")"
 
 # A whole input longer than a piece: counted across pieces cut between
 # characters, and transliterated piece by piece into the same bytes.
-for _ in $(seq 70000); do printf '%s' "$text"; done >"$work/long"
+printf '%s' "$text" | twice 16 >"$work/long"
 expect 0 "$nlsstr" count 20 --file "$work/long"
-same "long UTF-8 count" "characters $((70000 * 13))
-bytes      $((70000 * 30))" "$(cat "$work/out")"
+same "long UTF-8 count" "characters $((65536 * 13))
+bytes      $((65536 * 30))" "$(cat "$work/out")"
 expect 0 "$nlsstr" translit 20 --from 'é' --to 'e' --file "$work/long" --out raw
 cmp -s "$work/out" <(sed 's/é/e/g' "$work/long") || fail "pieces do not transliterate as the whole"
+# Modal pieces are cut where no double-byte run is open, so their bytes are
+# the input's.
+twice 17 <"$work/modal" >"$work/long-modal"
+expect 0 "$nlsstr" count ibm-930 --file "$work/long-modal"
+same "long modal count" "characters $((131072 * 10))
+bytes      $(wc -c <"$work/long-modal")" "$(cat "$work/out")"
+expect 0 "$nlsstr" translit ibm-930 --from 'e' --to 'E' --file "$work/long-modal" --out raw
+bytes ibm-930 "${modal/e/E}" | twice 17 | cmp -s - "$work/out" || fail "modal pieces are not the input's bytes"
 
 ((failures == 0)) && echo "all passed"
 exit $((failures != 0))
