@@ -23,14 +23,48 @@
 namespace kernel::cpu {
 
 // Instruction sets a hot path may have a variant for, weakest first.
-enum class Isa : uint8_t { sse2, avx2 };
+// avx512vbmi: AVX-512 F and BW with the byte permutes (VBMI).
+enum class Isa : uint8_t { sse2, avx2, avx512vbmi };
 
-inline constexpr std::array<Isa, 2> kAllIsas{Isa::sse2, Isa::avx2};
+inline constexpr std::array<Isa, 3> kAllIsas{Isa::sse2, Isa::avx2, Isa::avx512vbmi};
 
 // True when this processor and operating system run code built for `isa`.
 // Detected once; safe to call from any thread at any time.
 bool supports(Isa isa) noexcept;
 const char *name(Isa isa) noexcept;
+
+// The data caches one core sees, in bytes. `llc` is the whole last level,
+// which the cores sharing it compete for; on a processor with two levels it
+// is the second.
+struct Caches {
+  int64_t l1d;
+  int64_t l2;
+  int64_t llc;
+  int64_t line;
+};
+
+// Read from the processor's cache descriptors, else from the C library;
+// levels neither reports get typical sizes. Detected once, when the module
+// is loaded.
+const Caches &caches() noexcept;
+
+// True when the processor's string instructions (rep movsb, rep stosb) move
+// whole cache lines at a time (enhanced rep movsb/stosb).
+bool fast_string_ops() noexcept;
+
+// Block operations from these sizes on use the string instructions, where
+// the processor has fast ones (else never): a copy once its source and
+// destination no longer fit the first-level cache together, a fill once it
+// no longer fits the second level. Below, the vector loops are faster.
+int64_t string_copy_min() noexcept;
+int64_t string_fill_min() noexcept;
+
+// Block operations of at least this many bytes write with non-temporal
+// stores: their destination (and a copy's source besides) cannot stay in the
+// last-level cache, so storing through it would evict everything else and
+// first read every line it is about to replace.
+int64_t stream_copy_min() noexcept;
+int64_t stream_fill_min() noexcept;
 
 template <typename Table>
 struct Variant {
@@ -88,4 +122,17 @@ class Dispatch {
 #else
 #define NLSSM_TARGET_AVX2_BEGIN _Pragma("GCC push_options") _Pragma("GCC target(\"avx2\")")
 #define NLSSM_TARGET_AVX2_END _Pragma("GCC pop_options")
+#endif
+
+// The same for AVX-512 code with byte permutes.
+#if defined(__clang__)
+#define NLSSM_TARGET_AVX512VBMI_BEGIN \
+  _Pragma(                            \
+      "clang attribute push(__attribute__((target(\"avx512f,avx512bw,avx512vbmi\"))), \
+  apply_to = function)")
+#define NLSSM_TARGET_AVX512VBMI_END _Pragma("clang attribute pop")
+#else
+#define NLSSM_TARGET_AVX512VBMI_BEGIN \
+  _Pragma("GCC push_options") _Pragma("GCC target(\"avx512f,avx512bw,avx512vbmi\")")
+#define NLSSM_TARGET_AVX512VBMI_END _Pragma("GCC pop_options")
 #endif
