@@ -24,13 +24,7 @@ side_by_side "$data"
 
 echo
 echo "== upper-cased record by record (nlsstr upper 78 --records 80)"
-if "$nlsstr" --help | grep -q "^  upper "; then
-  "$nlsstr" upper 78 --records 80 --out raw --file "$data" >"$data.upper"
-else  # until case mapping is part of the build: the letters of the data set, mapped one by one
-  "$nlsstr" translit 78 --records 80 --out raw --file "$data" \
-    --from 'abcdefghijklmnopqrstuvwxyzäåáçèéíñóöøüú' --to 'ABCDEFGHIJKLMNOPQRSTUVWXYZÄÅÁÇÈÉÍÑÓÖØÜÚ' \
-    >"$data.upper"
-fi
+"$nlsstr" upper 78 --records 80 --out raw --file "$data" >"$data.upper"
 side_by_side "$data.upper"
 
 echo
