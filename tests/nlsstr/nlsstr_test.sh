@@ -89,6 +89,14 @@ for n in 4 5; do
     [[ $line == *0E* && ${line##*0E} != *0F* ]] && fail "record of $n left shifted out: $line"
   done <"$work/out"
 done
+# Raw records of a mapping verb come in batches: the same bytes as record by
+# record, across many batches.
+twice 15 <"$work/modal" >"$work/many"
+expect 0 "$nlsstr" upper ibm-930 --records 5 --file "$work/many" --out raw
+od -An -v -tx1 "$work/out" | tr -d ' \n' >"$work/batched"
+expect 0 "$nlsstr" upper ibm-930 --records 5 --file "$work/many" --out hex
+tr -d ' \n' <"$work/out" | tr 'A-F' 'a-f' | cmp -s - "$work/batched" ||
+  fail "batched records differ from single records"
 # A shift-out at the end of a record moves to the next one.
 expect 0 "$nlsstr" substr ibm-930 --records 4 --file "$work/modal" --out hex
 same "modal records of 4" "62 63

@@ -81,10 +81,14 @@ void add_verb(CLI::App &app, const Verb &verb, Arguments &args) {
       ->group(group);
 }
 
-void report(const std::string &verb, const Failure &failure, int64_t record) {
+void report(const std::string &verb, const Failure &failure, int64_t record = 0,
+            int64_t records = 1) {
   std::cout.flush();
   std::cerr << "nlsstr " << verb << ": ";
-  if (record > 0) std::cerr << "record " << record << ": ";
+  if (records > 1)
+    std::cerr << "records " << record << '-' << record + records - 1 << ": ";
+  else if (record > 0)
+    std::cerr << "record " << record << ": ";
   std::cerr << failure.what();
   if (failure.status != 0) {
     const std::string status = nlsstr::status_name(failure.status);
@@ -99,14 +103,14 @@ void report(const std::string &verb, const Failure &failure, int64_t record) {
 // ends it.
 int run(const Verb &verb, const Arguments &args) {
   nlsstr::Session session;
-  session.begin(args, verb.piecewise);
+  session.begin(args, verb.pieces);
   int worst = nlsstr::kExitOk;
   do {
     try {
       worst = std::max(worst, verb.run(session, args));
     } catch (const Failure &failure) {
       if (failure.status == 0 || session.record() == 0) throw;
-      report(verb.name, failure, session.record());
+      report(verb.name, failure, session.record(), session.records());
       worst = std::max(worst, failure.exit_code);
     }
   } while (session.more());
@@ -139,7 +143,7 @@ int main(int argc, char **argv) {
   try {
     return run(*chosen, args);
   } catch (const Failure &failure) {
-    report(chosen->name, failure, 0);
+    report(chosen->name, failure);
     return failure.exit_code;
   } catch (const std::exception &error) {  // a number option that is not one
     report(chosen->name, Failure(error.what()), 0);

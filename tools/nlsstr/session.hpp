@@ -53,22 +53,35 @@ struct Arguments {
   std::string option(const std::string &name, const std::string &fallback = "") const;
 };
 
+// How a verb can take a long text.
+enum class Pieces {
+  kWhole,  // only whole: the input is read whole, up to kWholeLimit bytes
+  // In pieces, adding up its results while Session::more_pieces().
+  kSums,
+  // In pieces, printing only the text it makes from each: its output for a
+  // text is its outputs for the text's pieces one after another. Such a
+  // verb also takes raw fixed-length records in batches of whole records.
+  kMaps,
+};
+
 class Session {
  public:
   Session();
   ~Session();
 
-  // Sets how --file or standard input is taken apart: --records N,
-  // --lines, or the whole text (in pieces when the verb's results on pieces
-  // follow each other as its result on the whole would).
-  void begin(const Arguments &args, bool piecewise);
+  // Sets how --file or standard input is taken apart for a verb: --records
+  // N, --lines, or the whole text (in pieces when the verb can take them).
+  void begin(const Arguments &args, Pieces pieces);
   // Whether the verb took a text from the input and another one follows:
   // the verb then runs again on it.
   bool more();
   // Whether the last text was a piece of a longer one and more follows.
   bool more_pieces();
-  // The number of the record or line just taken, from 1; 0 for a whole text.
+  // The number of the record or line just taken, from 1; 0 for a whole
+  // text. For a batch of records, the first one's number.
   int64_t record() const;
+  // Records in the text just taken: more than one in a batch.
+  int64_t records() const;
   void finish();
 
   // The handle for an encoding given by number or by name.
@@ -95,6 +108,7 @@ class Session {
   std::map<std::pair<int64_t, std::string>, std::vector<uint8_t>> texts_;
   Split split_ = Split::kWhole;
   size_t record_bytes_ = 0;
+  bool batch_ = false;
   std::string file_;
   std::unique_ptr<Stream> stream_;
   bool took_ = false;  // the verb took a text from the stream in this run

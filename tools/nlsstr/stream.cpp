@@ -191,27 +191,27 @@ void Reader::finish_progress() {
   shown_ = false;
 }
 
-Stream::Stream(Split split, size_t record_bytes, int fd, bool owned, std::string label)
-    : split_(split), record_bytes_(record_bytes), reader_(fd, owned, std::move(label)) {}
+Stream::Stream(Split split, size_t record_bytes, bool batch, int fd, bool owned, std::string label)
+    : split_(split),
+      record_bytes_(record_bytes),
+      batch_(batch && record_bytes < kBatchBytes),
+      reader_(fd, owned, std::move(label)) {}
 
-// Takes the text up to the last character boundary within `limit` bytes.
+// Appends the text up to the last character boundary within `limit` bytes.
 // Modal text is kept whole on both sides of a cut inside a double-byte run:
 // the text before it is closed with shift-in, the one after opened with
 // shift-out.
-std::vector<uint8_t> Stream::cut_text(size_t limit, bool prefer_single) {
-  const size_t shift = boundaries_->shift_in().size();
-  reader_.fill(limit + 4 + shift);
+void Stream::cut_into(std::vector<uint8_t> &text, size_t limit, bool prefer_single) {
+  const std::vector<uint8_t> &shift_out = boundaries_->shift_out(),
+                             &shift_in = boundaries_->shift_in();
+  reader_.fill(limit + 4 + shift_in.size());
   const Boundaries::Cut cut =
       boundaries_->cut(reader_.data(), limit, reader_.available(), shifted_, prefer_single);
-  std::vector<uint8_t> text;
-  text.reserve(cut.end + 2 * shift);
-  if (shifted_) text = boundaries_->shift_out();
+  if (shifted_) text.insert(text.end(), shift_out.begin(), shift_out.end());
   text.insert(text.end(), reader_.data(), reader_.data() + cut.end);
   reader_.consume(cut.end);
   shifted_ = cut.shifted && reader_.fill(1) > 0;
-  if (shifted_)
-    text.insert(text.end(), boundaries_->shift_in().begin(), boundaries_->shift_in().end());
-  return text;
+  if (shifted_) text.insert(text.end(), shift_in.begin(), shift_in.end());
 }
 
 std::vector<uint8_t> Stream::next(const NLSSMHandle *h) {
@@ -220,6 +220,7 @@ std::vector<uint8_t> Stream::next(const NLSSMHandle *h) {
     boundaries_ = std::make_unique<Boundaries>(h);
   }
   ++count_;
+  taken_ = 1;
   switch (split_) {
     case Split::kWhole: {
       reader_.fill(kWholeLimit + 1);
@@ -230,10 +231,22 @@ std::vector<uint8_t> Stream::next(const NLSSMHandle *h) {
       reader_.consume(reader_.available());
       return text;
     }
-    case Split::kPieces:
-      return cut_text(kPieceBytes, true);
-    case Split::kRecords:
-      return cut_text(record_bytes_, false);
+    case Split::kPieces: {
+      std::vector<uint8_t> text;
+      cut_into(text, kPieceBytes, true);
+      return text;
+    }
+    case Split::kRecords: {
+      std::vector<uint8_t> text;
+      if (batch_) text.reserve(kBatchBytes + 2 * record_bytes_ + 16);
+      cut_into(text, record_bytes_, false);
+      while (batch_ && text.size() + record_bytes_ <= kBatchBytes && more()) {
+        cut_into(text, record_bytes_, false);
+        ++count_;
+        ++taken_;
+      }
+      return text;
+    }
     case Split::kLines: {
       size_t width = 0, at = 0, want = 1;
       for (;;) {

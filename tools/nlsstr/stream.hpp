@@ -24,6 +24,7 @@ enum class Split {
 
 inline constexpr size_t kWholeLimit = size_t{64} << 20;
 inline constexpr size_t kPieceBytes = size_t{1} << 20;
+inline constexpr size_t kBatchBytes = size_t{256} << 10;
 // Inputs larger than this show a progress line on a terminal.
 inline constexpr uint64_t kProgressBytes = uint64_t{8} << 20;
 
@@ -94,7 +95,9 @@ class Reader {
 // The texts of one input in the order a verb takes them.
 class Stream {
  public:
-  Stream(Split split, size_t record_bytes, int fd, bool owned, std::string label);
+  // With `batch`, records come in batches of whole records, about
+  // kBatchBytes at a time, one after another in one text.
+  Stream(Split split, size_t record_bytes, bool batch, int fd, bool owned, std::string label);
 
   // The next text in the handle's encoding; the first call fixes the
   // encoding the input is cut in.
@@ -103,25 +106,30 @@ class Stream {
   bool more();
   // Whether the last text was a piece and more of the same text follows.
   bool more_pieces();
-  // Number of the last record or line, from 1; 0 for a whole text.
+  // Number of the last record or line (the first of a batch), from 1; 0 for
+  // a whole text.
   int64_t record() const {
-    return split_ == Split::kRecords || split_ == Split::kLines ? count_ : 0;
+    return split_ == Split::kRecords || split_ == Split::kLines ? count_ - taken_ + 1 : 0;
   }
+  // Records in the last text.
+  int64_t records() const { return taken_; }
   Split split() const { return split_; }
   // The newline that ended the last line (empty at the end of the input).
   const std::vector<uint8_t> &line_end() const { return line_end_; }
   void finish() { reader_.finish_progress(); }
 
  private:
-  std::vector<uint8_t> cut_text(size_t limit, bool prefer_single);
+  void cut_into(std::vector<uint8_t> &text, size_t limit, bool prefer_single);
 
   Split split_;
   size_t record_bytes_;
+  bool batch_;
   Reader reader_;
   const NLSSMHandle *handle_ = nullptr;
   std::unique_ptr<Boundaries> boundaries_;
   bool shifted_ = false;  // the next text continues a double-byte run
-  int64_t count_ = 0;
+  int64_t count_ = 0;     // records and lines taken
+  int64_t taken_ = 0;     // of them in the last text
   std::vector<uint8_t> line_end_;
 };
 

@@ -49,10 +49,10 @@ int normalize(Session &session, const Arguments &args) {
 
 const RegisterVerb kUpper{
     {"upper", "ENCODING [--options N]", "the text in upper case (the handle's NLSStringUpperS)",
-     [](Session &s, const Arguments &a) { return map_case(s, a, true); }, true}};
+     [](Session &s, const Arguments &a) { return map_case(s, a, true); }, Pieces::kMaps}};
 const RegisterVerb kLower{
     {"lower", "ENCODING [--options N]", "the text in lower case (the handle's NLSStringLowerS)",
-     [](Session &s, const Arguments &a) { return map_case(s, a, false); }, true}};
+     [](Session &s, const Arguments &a) { return map_case(s, a, false); }, Pieces::kMaps}};
 const RegisterVerb kNormalize{
     {"normalize", "ENCODING [--options N] [--capacity BYTES]",
      "the text copied in one case, upper with --options 2 (the handle's NLSStringNormalizeS)",

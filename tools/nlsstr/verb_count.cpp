@@ -33,7 +33,7 @@ int count(Session &session, const Arguments &args) {
 
 const RegisterVerb kCount{{"count", "ENCODING",
                            "characters (through the handle's NLSNumCharsS) and bytes of the text",
-                           count, true}};
+                           count, Pieces::kSums}};
 
 }  // namespace
 }  // namespace nlsstr

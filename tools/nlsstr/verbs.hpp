@@ -18,11 +18,8 @@ struct Verb {
   std::string usage;    // arguments after the verb
   std::string summary;  // one line
   std::function<int(Session &, const Arguments &)> run;
-  // Whether the verb's results on the pieces of a text, one after another,
-  // are its result on the whole text (a character-by-character mapping, or
-  // a verb that adds up its pieces while Session::more_pieces()): then a
-  // whole input is handed to it in pieces instead of being read whole.
-  bool piecewise = false;
+  // Whether the verb can take a long text in pieces (see Pieces).
+  Pieces pieces = Pieces::kWhole;
 };
 
 std::vector<Verb> &verbs();
