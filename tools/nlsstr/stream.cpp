@@ -83,9 +83,8 @@ size_t find_unit(const uint8_t *p, size_t available, const uint8_t *unit, size_t
 
 }  // namespace
 
-Boundaries::Boundaries(const NLSSMHandle *h)
-    : h_(h), modal_(h->encodingClass == NLSSM_CLASS_MBCS_MODAL) {
-  if (modal_) {
+Boundaries::Boundaries(const NLSSMHandle *h) : h_(h) {
+  if (h->encodingClass == NLSSM_CLASS_MBCS_MODAL) {
     const nlssm::cursor::ModalModel model(h);
     const auto length = static_cast<size_t>(model.length);
     shift_out_.assign(model.shift_out, model.shift_out + length);
@@ -95,8 +94,7 @@ Boundaries::Boundaries(const NLSSMHandle *h)
 
 Boundaries::Cut Boundaries::cut(const uint8_t *p, size_t limit, size_t available, bool shifted,
                                 bool prefer_single) const {
-  if (h_->encodingClass == NLSSM_CLASS_SBCS)
-    return {std::max<size_t>(std::min(limit, available), std::min<size_t>(available, 1)), false};
+  if (h_->encodingClass == NLSSM_CLASS_SBCS) return {std::min(limit, available), false};
   return with_model(h_, [&](const auto &model) {
     return cut_with(model, p, limit, available, shifted, prefer_single);
   });

@@ -47,13 +47,11 @@ class Boundaries {
   // there is none); its length through `width`.
   size_t newline(const uint8_t *p, size_t available, size_t &width) const;
 
-  bool modal() const { return modal_; }
   const std::vector<uint8_t> &shift_out() const { return shift_out_; }
   const std::vector<uint8_t> &shift_in() const { return shift_in_; }
 
  private:
   const NLSSMHandle *h_;
-  bool modal_;
   std::vector<uint8_t> shift_out_, shift_in_;
 };
 
