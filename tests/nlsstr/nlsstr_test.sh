@@ -113,6 +113,8 @@ record 4: 1 characters, 1 bytes" "$(cat "$work/out")"
 expect 0 "$nlsstr" substr ibm-037 --lines --file "$work/ebcdic" --out raw
 cmp -s "$work/out" "$work/ebcdic" || fail "raw lines do not keep their newlines"
 printf 'a\x00\x0a\x01\n\x00b\x00' >"$work/utf16"  # a, U+010A (not a newline), LF, b
+expect 0 "$nlsstr" substr 25 --lines --file "$work/utf16" --out raw
+cmp -s "$work/out" "$work/utf16" || fail "raw UTF-16 lines do not keep their newlines"
 expect 0 "$nlsstr" count 25 --lines --file "$work/utf16"
 same "UTF-16LE lines" "record 1: 2 characters, 4 bytes
 record 2: 1 characters, 2 bytes" "$(cat "$work/out")"
@@ -125,6 +127,11 @@ same "long UTF-8 count" "characters $((65536 * 13))
 bytes      $((65536 * 30))" "$(cat "$work/out")"
 expect 0 "$nlsstr" translit 20 --from 'é' --to 'e' --file "$work/long" --out raw
 cmp -s "$work/out" <(sed 's/é/e/g' "$work/long") || fail "pieces do not transliterate as the whole"
+# Printed as UTF-8, the pieces of one text make one line.
+"$nlsstr" upper 20 --text "$text" --out raw | twice 16 >"$work/expected"
+echo >>"$work/expected"
+expect 0 "$nlsstr" upper 20 --file "$work/long"
+cmp -s "$work/out" "$work/expected" || fail "upper-cased pieces are not the upper-cased text"
 # Modal pieces are cut where no double-byte run is open, so their bytes are
 # the input's.
 twice 17 <"$work/modal" >"$work/long-modal"
