@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <iostream>
 
 #include "cursor/char_model.hpp"
 #include "edit/character_walk.hpp"
@@ -135,6 +136,7 @@ Reader::Reader(int fd, bool owned, std::string label)
   struct stat info {};
   if (fstat(fd_, &info) == 0 && S_ISREG(info.st_mode)) total_ = static_cast<uint64_t>(info.st_size);
   progress_ = isatty(STDERR_FILENO) == 1;
+  interactive_ = isatty(fd_) == 1;
   start_ = last_ = std::chrono::steady_clock::now();
 }
 
@@ -267,6 +269,7 @@ std::vector<uint8_t> Stream::next(const NLSSMHandle *h) {
 }
 
 bool Stream::more() {
+  if (reader_.interactive() && reader_.available() == 0) std::cout.flush();
   return reader_.fill(1) > 0;
 }
 

@@ -72,6 +72,8 @@ class Reader {
   size_t available() const { return end_ - begin_; }
   void consume(size_t n) { begin_ += n; }
   bool ended() const { return ended_ && begin_ == end_; }
+  // Whether the input is a terminal, where someone waits for each result.
+  bool interactive() const { return interactive_; }
   // Removes the progress line, if one is shown.
   void finish_progress();
 
@@ -86,7 +88,7 @@ class Reader {
   bool ended_ = false;
   uint64_t total_ = 0;  // size of a regular file, else 0
   uint64_t read_ = 0;
-  bool progress_ = false, shown_ = false;
+  bool progress_ = false, shown_ = false, interactive_ = false;
   std::chrono::steady_clock::time_point start_, last_;
 };
 
@@ -100,7 +102,8 @@ class Stream {
   // The next text in the handle's encoding; the first call fixes the
   // encoding the input is cut in.
   std::vector<uint8_t> next(const NLSSMHandle *h);
-  // Whether another text follows.
+  // Whether another text follows. On a terminal, what was printed so far
+  // is shown first.
   bool more();
   // Whether the last text was a piece and more of the same text follows.
   bool more_pieces();
