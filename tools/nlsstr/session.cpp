@@ -1,12 +1,15 @@
 #include "session.hpp"
 
 #include <nlssm/host.h>
+#include <nlssm/nlssm.hpp>
 
+#include <fcntl.h>
+#include <unistd.h>
+
+#include <cerrno>
 #include <cstdio>
-#include <fstream>
+#include <cstring>
 #include <iostream>
-#include <iterator>
-#include <sstream>
 
 namespace nlsstr {
 namespace {
@@ -44,25 +47,8 @@ std::vector<uint8_t> parse_hex(const std::string &text) {
 }  // namespace
 
 std::string status_name(int64_t status) {
-  static const std::map<int64_t, std::string> names = {
-      {NLSSM_E_NO_MEMORY, "NLSSM_E_NO_MEMORY"},
-      {NLSSM_E_UNSUPPORTED, "NLSSM_E_UNSUPPORTED"},
-      {NLSSM_E_DEST_TOO_SMALL, "NLSSM_E_DEST_TOO_SMALL"},
-      {NLSSM_E_ILL_FORMED, "NLSSM_E_ILL_FORMED"},
-      {NLSSM_E_ENCODING, "NLSSM_E_ENCODING"},
-      {NLSSM_E_NUMBER_DOES_NOT_FIT, "NLSSM_E_NUMBER_DOES_NOT_FIT"},
-      {NLSSM_E_NOT_A_NUMBER, "NLSSM_E_NOT_A_NUMBER"},
-      {NLSSM_E_INT_OVERFLOW, "NLSSM_E_INT_OVERFLOW"},
-      {NLSSM_E_TRUNCATED_SEQUENCE, "NLSSM_E_TRUNCATED_SEQUENCE"},
-      {NLSSM_E_NUMBER_TOO_LONG, "NLSSM_E_NUMBER_TOO_LONG"},
-      {NLSSM_E_NULL_ARGUMENT, "NLSSM_E_NULL_ARGUMENT"},
-      {NLSSM_E_BAD_CHARACTER, "NLSSM_E_BAD_CHARACTER"},
-      {NLSSM_E_BAD_OPTIONS, "NLSSM_E_BAD_OPTIONS"},
-      {NLSSM_E_BAD_ARGUMENT, "NLSSM_E_BAD_ARGUMENT"},
-      {NLSSM_E_BAD_ALIGNMENT, "NLSSM_E_BAD_ALIGNMENT"},
-  };
-  const auto found = names.find(status);
-  return found == names.end() ? std::string() : found->second;
+  if (status == 0 || status < 0 || status > UINT32_MAX) return {};
+  return nlssm::Status(static_cast<uint32_t>(status)).name();
 }
 
 void check(int64_t status, const std::string &what) {
@@ -88,7 +74,54 @@ Session::Session() : host_(nlssm::refhost::ReferenceHost::start(nlssm::refhost::
   if (host_->module() == nullptr) throw Failure("the module could not be started");
 }
 
-Session::~Session() = default;
+Session::~Session() {
+  for (const auto &[pair, converter] : converters_)
+    slot_of<NLSHostConverterDestroyFn>(converter, NLSHOST_SLOT_CONVERTER_DESTROY)(converter);
+}
+
+void Session::begin(const Arguments &args, Pieces pieces) {
+  if (args.has("records") && args.has("lines"))
+    throw Failure("give --records or --lines, not both");
+  split_ = pieces == Pieces::kWhole ? Split::kWhole : Split::kPieces;
+  if (args.has("lines")) split_ = Split::kLines;
+  if (args.has("records")) {
+    split_ = Split::kRecords;
+    try {
+      record_bytes_ = std::stoull(args.option("records"));
+    } catch (const std::exception &) {
+      record_bytes_ = 0;
+    }
+    if (record_bytes_ == 0) throw Failure("--records takes a record length in bytes");
+  }
+  file_ = args.option("file");
+  // Raw records of a mapping verb follow each other in its output as they
+  // do in the input: a batch of them gives the same bytes at a fraction of
+  // the cost of one call per record.
+  batch_ =
+      pieces == Pieces::kMaps && split_ == Split::kRecords && output_form(args) == OutputForm::kRaw;
+}
+
+bool Session::more() {
+  const bool again = took_ && stream_ != nullptr && stream_->more();
+  took_ = false;
+  return again;
+}
+
+bool Session::more_pieces() {
+  return stream_ != nullptr && stream_->more_pieces();
+}
+
+int64_t Session::record() const {
+  return stream_ != nullptr ? stream_->record() : 0;
+}
+
+int64_t Session::records() const {
+  return stream_ != nullptr ? stream_->records() : 0;
+}
+
+void Session::finish() {
+  if (stream_ != nullptr) stream_->finish();
+}
 
 int Session::encoding_number(const std::string &encoding) const {
   if (!encoding.empty() && encoding.find_first_not_of("0123456789") == std::string::npos)
@@ -99,25 +132,33 @@ int Session::encoding_number(const std::string &encoding) const {
 }
 
 const NLSSMHandle *Session::handle(const std::string &encoding) {
+  const auto known = handles_.find(encoding);
+  if (known != handles_.end()) return known->second;
   NLSSMHandle *handle = nullptr;
   check(host_->create_handle(encoding_number(encoding), &handle),
         "creating a handle for encoding " + encoding);
   if (handle == nullptr) throw Failure("no handle for encoding " + encoding);
+  handles_.emplace(encoding, handle);
   return handle;
 }
 
 std::vector<uint8_t> Session::convert(int64_t from, int64_t to,
                                       const std::vector<uint8_t> &text) const {
-  void *nls = host_->nls();
-  void *converter = slot_of<NLSHostConverterBetweenFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_BETWEEN)(
-      nls, from, to, nullptr, nullptr);
-  if (converter == nullptr) throw Failure("no converter between the encodings", NLSSM_E_ENCODING);
+  void *&converter = converters_[{from, to}];
+  if (converter == nullptr) {
+    void *nls = host_->nls();
+    converter = slot_of<NLSHostConverterBetweenFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_BETWEEN)(
+        nls, from, to, nullptr, nullptr);
+  }
+  if (converter == nullptr) {
+    converters_.erase({from, to});
+    throw Failure("no converter between the encodings", NLSSM_E_ENCODING);
+  }
   std::vector<uint8_t> out(text.size() * 4 + 16);
   uint64_t produced = 0;
   const int64_t status =
       slot_of<NLSHostConverterConvertFn>(converter, NLSHOST_SLOT_CONVERTER_CONVERT)(
           converter, text.data(), text.size(), out.data(), out.size(), &produced, nullptr);
-  slot_of<NLSHostConverterDestroyFn>(converter, NLSHOST_SLOT_CONVERTER_DESTROY)(converter);
   check(status, "converting the text");
   out.resize(produced);
   return out;
@@ -125,17 +166,28 @@ std::vector<uint8_t> Session::convert(int64_t from, int64_t to,
 
 std::vector<uint8_t> Session::input(const NLSSMHandle *handle, const Arguments &args) {
   if (args.has("text")) {
+    // Verbs convert their words again for every record: keep the last few.
     const std::string &utf8 = args.options.at("text");
-    return convert(NLSSM_ENC_UTF8, handle->encodingNumber,
-                   std::vector<uint8_t>(utf8.begin(), utf8.end()));
+    const auto key = std::make_pair(static_cast<int64_t>(handle->encodingNumber), utf8);
+    const auto known = texts_.find(key);
+    if (known != texts_.end()) return known->second;
+    std::vector<uint8_t> text = convert(NLSSM_ENC_UTF8, handle->encodingNumber,
+                                        std::vector<uint8_t>(utf8.begin(), utf8.end()));
+    if (texts_.size() < 64 && utf8.size() < 4096) texts_.emplace(key, text);
+    return text;
   }
   if (args.has("hex")) return parse_hex(args.options.at("hex"));
-  if (args.has("file")) {
-    std::ifstream file(args.options.at("file"), std::ios::binary);
-    if (!file) throw Failure("cannot read " + args.options.at("file"));
-    return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
+  if (stream_ == nullptr) {
+    int fd = STDIN_FILENO;
+    if (!file_.empty() && (fd = open(file_.c_str(), O_RDONLY | O_CLOEXEC)) < 0)
+      throw Failure("cannot read " + file_ + ": " + std::strerror(errno), 0, kExitInput);
+    stream_ = std::make_unique<Stream>(split_, record_bytes_, batch_, fd, !file_.empty(),
+                                       file_.empty() ? "standard input" : file_);
   }
-  return {std::istreambuf_iterator<char>(std::cin), std::istreambuf_iterator<char>()};
+  took_ = true;
+  std::vector<uint8_t> text = stream_->next(handle);
+  if (text.capacity() == 0) text.reserve(1);  // an empty line still has a buffer to point at
+  return text;
 }
 
 OutputForm Session::output_form(const Arguments &args) {
@@ -143,25 +195,38 @@ OutputForm Session::output_form(const Arguments &args) {
   if (form == "utf8") return OutputForm::kUtf8;
   if (form == "hex") return OutputForm::kHex;
   if (form == "raw") return OutputForm::kRaw;
-  throw Failure("--out takes utf8, hex or raw");
+  if (form == "both") return OutputForm::kBoth;
+  throw Failure("--out takes utf8, hex, raw or both");
+}
+
+// What follows a text printed from the input: records and whole texts
+// print one per line, a line printed raw keeps its own newline, and the
+// pieces of a long text follow each other with one newline at the end.
+void Session::print_line_end(OutputForm form) const {
+  const Split split = took_ && stream_ != nullptr ? stream_->split() : Split::kWhole;
+  if (split == Split::kPieces && stream_->more_pieces()) {
+    if (form == OutputForm::kHex) std::cout << ' ';
+    if (form != OutputForm::kBoth) return;
+  }
+  if (form != OutputForm::kRaw) {
+    std::cout << '\n';
+  } else if (split == Split::kLines) {
+    const std::vector<uint8_t> &end = stream_->line_end();
+    std::cout.write(reinterpret_cast<const char *>(end.data()), std::ssize(end));
+  }
 }
 
 void Session::print_text(const NLSSMHandle *handle, const std::vector<uint8_t> &text,
                          OutputForm form) const {
-  switch (form) {
-    case OutputForm::kRaw:
-      std::cout.write(reinterpret_cast<const char *>(text.data()), text.size());
-      return;
-    case OutputForm::kHex:
-      std::cout << hex(text.data(), text.size()) << '\n';
-      return;
-    case OutputForm::kUtf8: {
-      const std::vector<uint8_t> utf8 = convert(handle->encodingNumber, NLSSM_ENC_UTF8, text);
-      std::cout.write(reinterpret_cast<const char *>(utf8.data()), utf8.size());
-      std::cout << '\n';
-      return;
-    }
+  if (form == OutputForm::kHex || form == OutputForm::kBoth)
+    std::cout << hex(text.data(), text.size()) << (form == OutputForm::kBoth ? "  " : "");
+  if (form == OutputForm::kRaw)
+    std::cout.write(reinterpret_cast<const char *>(text.data()), std::ssize(text));
+  if (form == OutputForm::kUtf8 || form == OutputForm::kBoth) {
+    const std::vector<uint8_t> utf8 = convert(handle->encodingNumber, NLSSM_ENC_UTF8, text);
+    std::cout.write(reinterpret_cast<const char *>(utf8.data()), std::ssize(utf8));
   }
+  print_line_end(form);
 }
 
 }  // namespace nlsstr

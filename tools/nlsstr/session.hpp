@@ -5,6 +5,8 @@
 #include <nlssm/nlssm.h>
 #include <nlssm/reference_host.hpp>
 
+#include "stream.hpp"
+
 #include <cstdint>
 #include <map>
 #include <memory>
@@ -14,12 +16,24 @@
 
 namespace nlsstr {
 
+// Exit codes of nlsstr.
+inline constexpr int kExitOk = 0;
+inline constexpr int kExitStatus = 1;  // a failing status, or the answer "no"
+inline constexpr int kExitUsage = 2;   // the command line is wrong
+inline constexpr int kExitInput = 3;   // the input cannot be read or is too long
+
 // A failure the tool reports and exits on: a message, and a module status
-// when one caused it.
+// when one caused it. Without an explicit exit code, a failure with a status
+// exits with kExitStatus, one without with kExitUsage.
 struct Failure : std::runtime_error {
-  Failure(const std::string &message, int64_t status = 0)
-      : std::runtime_error(message), status(status) {}
+  Failure(const std::string &message, int64_t status = 0, int exit_code = 0)
+      : std::runtime_error(message),
+        status(status),
+        exit_code(exit_code != 0 ? exit_code
+                  : status != 0  ? kExitStatus
+                                 : kExitUsage) {}
   int64_t status;
+  int exit_code;
 };
 
 // The name of a module or host status ("NLSSM_E_DEST_TOO_SMALL"), or "".
@@ -27,7 +41,9 @@ std::string status_name(int64_t status);
 // Throws Failure when an operation returned a non-zero status.
 void check(int64_t status, const std::string &what);
 
-enum class OutputForm { kUtf8, kHex, kRaw };
+// Text results: converted to UTF-8, as hex bytes, as they are, or hex bytes
+// with the UTF-8 beside them.
+enum class OutputForm { kUtf8, kHex, kRaw, kBoth };
 
 // Command-line options shared by the verbs: positional words and --name value.
 struct Arguments {
@@ -37,17 +53,43 @@ struct Arguments {
   std::string option(const std::string &name, const std::string &fallback = "") const;
 };
 
+// How a verb can take a long text.
+enum class Pieces {
+  kWhole,  // only whole: the input is read whole, up to kWholeLimit bytes
+  // In pieces, adding up its results while Session::more_pieces().
+  kSums,
+  // In pieces, printing only the text it makes from each: its output for a
+  // text is its outputs for the text's pieces one after another. Such a
+  // verb also takes raw fixed-length records in batches of whole records.
+  kMaps,
+};
+
 class Session {
  public:
   Session();
   ~Session();
+
+  // Sets how --file or standard input is taken apart for a verb: --records
+  // N, --lines, or the whole text (in pieces when the verb can take them).
+  void begin(const Arguments &args, Pieces pieces);
+  // Whether the verb took a text from the input and another one follows:
+  // the verb then runs again on it.
+  bool more();
+  // Whether the last text was a piece of a longer one and more follows.
+  bool more_pieces();
+  // The number of the record or line just taken, from 1; 0 for a whole
+  // text. For a batch of records, the first one's number.
+  int64_t record() const;
+  // Records in the text just taken: more than one in a batch.
+  int64_t records() const;
+  void finish();
 
   // The handle for an encoding given by number or by name.
   const NLSSMHandle *handle(const std::string &encoding);
   int encoding_number(const std::string &encoding) const;
 
   // The input text in the handle's encoding: --text (UTF-8, converted),
-  // --hex, --file, or standard input (bytes as they are).
+  // --hex, or the next text of --file or standard input (bytes as they are).
   std::vector<uint8_t> input(const NLSSMHandle *handle, const Arguments &args);
   // Writes text of the handle's encoding in the form --out asks for.
   void print_text(const NLSSMHandle *handle, const std::vector<uint8_t> &text,
@@ -58,7 +100,18 @@ class Session {
 
  private:
   std::vector<uint8_t> convert(int64_t from, int64_t to, const std::vector<uint8_t> &text) const;
+  void print_line_end(OutputForm form) const;
+
   std::unique_ptr<nlssm::refhost::ReferenceHost> host_;
+  std::map<std::string, const NLSSMHandle *> handles_;
+  mutable std::map<std::pair<int64_t, int64_t>, void *> converters_;
+  std::map<std::pair<int64_t, std::string>, std::vector<uint8_t>> texts_;
+  Split split_ = Split::kWhole;
+  size_t record_bytes_ = 0;
+  bool batch_ = false;
+  std::string file_;
+  std::unique_ptr<Stream> stream_;
+  bool took_ = false;  // the verb took a text from the stream in this run
 };
 
 // Calls the operation stored in a handle slot with the given prototype.

@@ -47,12 +47,12 @@ int normalize(Session &session, const Arguments &args) {
   return 0;
 }
 
-const RegisterVerb kUpper{{"upper", "ENCODING [--options N]",
-                           "the text in upper case (the handle's NLSStringUpperS)",
-                           [](Session &s, const Arguments &a) { return map_case(s, a, true); }}};
-const RegisterVerb kLower{{"lower", "ENCODING [--options N]",
-                           "the text in lower case (the handle's NLSStringLowerS)",
-                           [](Session &s, const Arguments &a) { return map_case(s, a, false); }}};
+const RegisterVerb kUpper{
+    {"upper", "ENCODING [--options N]", "the text in upper case (the handle's NLSStringUpperS)",
+     [](Session &s, const Arguments &a) { return map_case(s, a, true); }, Pieces::kMaps}};
+const RegisterVerb kLower{
+    {"lower", "ENCODING [--options N]", "the text in lower case (the handle's NLSStringLowerS)",
+     [](Session &s, const Arguments &a) { return map_case(s, a, false); }, Pieces::kMaps}};
 const RegisterVerb kNormalize{
     {"normalize", "ENCODING [--options N] [--capacity BYTES]",
      "the text copied in one case, upper with --options 2 (the handle's NLSStringNormalizeS)",

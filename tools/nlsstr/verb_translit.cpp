@@ -107,7 +107,8 @@ int unquote(Session &session, const Arguments &args) {
 
 const RegisterVerb kTranslit{
     {"translit", "ENCODING --from LIST --to LIST [--pairs N] [--room BYTES]",
-     "replace each character of --from by the --to character at the same index", translit}};
+     "replace each character of --from by the --to character at the same index", translit,
+     Pieces::kMaps}};
 const RegisterVerb kTranword{{"tranword", "ENCODING --find WORD --replace WORD [--room BYTES]",
                               "replace every occurrence of a word", tranword}};
 const RegisterVerb kSqueeze{{"squeeze", "ENCODING [--char C] [--room BYTES]",
