@@ -3,7 +3,7 @@
 set -euo pipefail
 
 packages=(g++ cmake ninja-build pkg-config libicu-dev icu-devtools libgtest-dev libgmock-dev
-          libbenchmark-dev clang libclang-rt-dev binutils doxygen)
+          libbenchmark-dev clang libclang-rt-dev binutils doxygen unicode-data)
 missing=()
 for p in "${packages[@]}"; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed" || missing+=("$p")

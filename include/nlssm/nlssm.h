@@ -2733,5 +2733,106 @@ NLSSM_API int64_t NLSStringFromDouble_fromQVChar(const NLSSMHandle *handle, void
                                                  int64_t capacity, int32_t *written);
 
 /* ---- Bidirectional text --------------------------------------------------- */
+/* Base direction: *direction is set to 0 (left-to-right) first and becomes 1
+ * (right-to-left) when the first character of category L (0), R (3) or AL (4)
+ * is R or AL; other categories, and characters the host has no category for,
+ * are passed over. `length` is in bytes. A null `direction` gives
+ * NLSSM_E_NULL_ARGUMENT; a null text with a positive length too.
+ * SBCS: bytes through the handle's bidiTable (none: left-to-right).
+ * UTF-8: every character takes the length the text's first byte announces
+ * (00-7F 1, C0-DF 2, E0-EF 3, F0-F7 4, F8-FB 5, any other 6), its value built
+ * from those bytes and asked of the host; a character that would reach more
+ * than one byte past `length` gives NLSSM_E_BAD_CHARACTER, so up to one byte
+ * past `length` is read. UTFE and MBCS: always left-to-right, status 0.
+ * WCS2: 16-bit units, little-endian for encoding 25, else big-endian; a high
+ * surrogate goes to the host with the unit after it as (high << 16) | low,
+ * read even past `length` (2 bytes); a high surrogate without a low one, or
+ * a lone low one, gives NLSSM_E_BAD_CHARACTER. An odd last byte is ignored.
+ * WCS4: 32-bit units, little-endian for encoding 27, else big-endian; bytes
+ * after the last whole unit are ignored. */
+NLSSM_API int64_t NLSGetBaseDirection_SBCS(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+NLSSM_API int64_t NLSGetBaseDirection_UTF8(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+NLSSM_API int64_t NLSGetBaseDirection_UTFE(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+NLSSM_API int64_t NLSGetBaseDirection_WCS2(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+NLSSM_API int64_t NLSGetBaseDirection_WCS4(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+NLSSM_API int64_t NLSGetBaseDirection_MBCS(const NLSSMHandle *handle, const uint8_t *text,
+                                           int64_t length, uint8_t *direction);
+
+/* Reordering of one line, after the Unicode Bidirectional Algorithm (UAX #9:
+ * paragraph level, explicit embeddings, overrides and isolates, weak and
+ * neutral types, paired brackets, implicit levels, trailing white space,
+ * reversal of levels, mirroring).
+ *   NLSVisualOrderFormat: text in reading (logical) order -> display order,
+ *     left to right; characters at right-to-left levels that have a mirror
+ *     image are shown mirrored.
+ *   NLSLogicalOrderFormat: a displayed line -> a reading order that
+ *     displays as that line (with the same paragraph level). The first
+ *     attempt is the line resolved as if it were in reading order with its
+ *     runs reversed (and mirrored) back; while an attempt does not display as
+ *     the line, the next undoes the display order it resolved to, up to 8
+ *     attempts in all. When none does, the first attempt is the result (status
+ *     0 all the same): a line may have no reading order that displays as it.
+ *     Words of either direction with blanks between them come back exactly
+ *     as they were written; in general a line can come from several reading
+ *     orders, and this gives one of them.
+ * (handle, source, source bytes, destination, capacity in bytes, out bytes
+ * written (may be null), direction) -> status.
+ * *direction in: 0 left-to-right, 1 right-to-left, any other value: from the
+ * text's first strong character outside isolates (left-to-right when it has
+ * none; for NLSLogicalOrderFormat the displayed line's first, from the
+ * left). Out: the paragraph level used, 0 or 1 (of the first paragraph).
+ * A paragraph separator ends a paragraph: each is resolved and reordered on
+ * its own, in place. Embedding and override controls and boundary neutrals
+ * stay in the text, placed with the character before them.
+ * Characters: SBCS bytes with the categories of the reordering table of the
+ * handle's bidiTable (a byte without a category counts as ON; the page's
+ * ( ) [ ] { } are paired brackets, its eight bracket-like characters
+ * mirror); without a table every byte is left-to-right and the text comes
+ * back unchanged. UTF-8
+ * (encoding 20) or UTF-EBCDIC (other class-1 encodings), UTF-16 (WCS2;
+ * big-endian for encoding 24, else little-endian) and UTF-32 (WCS4;
+ * big-endian for encoding 26, else little-endian) with the host's categories
+ * and the Unicode paired brackets and mirror images. Ill-formed input (a bad
+ * sequence, a lone surrogate, a value above U+10FFFF) becomes U+FFFD, class
+ * ON, with NLSSM_E_ILL_FORMED; input ending inside a character likewise with
+ * NLSSM_E_TRUNCATED_SEQUENCE; the rest is still reordered.
+ * The output takes as many bytes as the input, save for replaced input and
+ * mirror images of another length. When it does not fit, the characters that
+ * fit (in output order, none split) are written and the result is
+ * NLSSM_E_DEST_TOO_SMALL; nothing is written past `capacity`. Negative
+ * lengths count as 0. Null handle or direction, or a null buffer with a
+ * positive length: NLSSM_E_NULL_ARGUMENT. The work area (about 70 bytes per
+ * character) comes from the handle's pool beyond 2 KiB: NLSSM_E_NO_MEMORY
+ * when the pool refuses, and for a text of 2 GiB or more. The source and
+ * destination must not overlap. */
+NLSSM_API int64_t NLSVisualOrderFormat_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                            int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSVisualOrderFormat_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                            int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSVisualOrderFormat_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                            int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSVisualOrderFormat_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                            int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSLogicalOrderFormat_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                             int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                             int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSLogicalOrderFormat_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                             int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                             int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSLogicalOrderFormat_WCS2(const NLSSMHandle *handle, const uint8_t *source,
+                                             int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                             int64_t *written, uint8_t *direction);
+NLSSM_API int64_t NLSLogicalOrderFormat_WCS4(const NLSSMHandle *handle, const uint8_t *source,
+                                             int64_t sourceBytes, uint8_t *destination, int64_t capacity,
+                                             int64_t *written, uint8_t *direction);
 
 #endif /* NLSSM_NLSSM_H */

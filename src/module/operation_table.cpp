@@ -361,6 +361,25 @@ const std::array kRows = {
         {same(op(&NLSStringIs_SBCS)), same(op(&NLSStringIsGraph_UTF8)),
          same(op(&NLSStringIsGraph_WCS2)), same(op(&NLSStringIsGraph_WCS4)),
          same(op(&NLSStringIsGraph_MBCS)), same(op(&NLSStringIsGraph_MBCS))}},
+    Row{79,  // NLSGetBaseDirection
+        {same(op(&NLSGetBaseDirection_SBCS)),
+         utf(op(&NLSGetBaseDirection_UTF8), op(&NLSGetBaseDirection_UTFE)),
+         same(op(&NLSGetBaseDirection_WCS2)), same(op(&NLSGetBaseDirection_WCS4)),
+         same(op(&NLSGetBaseDirection_MBCS)), same(op(&NLSGetBaseDirection_MBCS))}},
+    Row{80,  // NLSVisualOrderFormat
+        {same(op(&NLSVisualOrderFormat_SBCS)),
+         same(op(&NLSVisualOrderFormat_UTF8)),
+         same(op(&NLSVisualOrderFormat_WCS2)),
+         same(op(&NLSVisualOrderFormat_WCS4)),
+         {},
+         {}}},
+    Row{81,  // NLSLogicalOrderFormat
+        {same(op(&NLSLogicalOrderFormat_SBCS)),
+         same(op(&NLSLogicalOrderFormat_UTF8)),
+         same(op(&NLSLogicalOrderFormat_WCS2)),
+         same(op(&NLSLogicalOrderFormat_WCS4)),
+         {},
+         {}}},
     Row{86,  // NLSStringVerify
         {same(op(&NLSStringVerify_SBCS)), same(op(&NLSStringVerify_UTF8)),
          endian(op(&NLSStringVerify_WCS2L), op(&NLSStringVerify_WCS2B)),
