@@ -317,6 +317,10 @@ constexpr CharClass operator|(CharClass a, CharClass b) {
   return static_cast<CharClass>(static_cast<std::int32_t>(a) | static_cast<std::int32_t>(b));
 }
 
+// A paragraph direction; from_text takes it from the text's first strong
+// character.
+enum class Direction : std::uint8_t { left_to_right = 0, right_to_left = 1, from_text = 2 };
+
 // Where justify puts the text of a field between its blanks.
 enum class Align : char { left = 'L', right = 'R', centre = 'C', none = 'N' };
 
@@ -680,6 +684,26 @@ class Text {
                 });
   }
 
+  // ---- Bidirectional text -----------------------------------------------------------
+
+  // Right-to-left when the first strongly directional character is.
+  Result<Direction> base_direction() const {
+    std::uint8_t direction = 0;
+    const std::int64_t r = call<decltype(&NLSGetBaseDirection_SBCS)>(
+        handle()->NLSGetBaseDirection, data(), byte_length(), &direction);
+    if (r != 0) return status(r);
+    return static_cast<Direction>(direction);
+  }
+  // The text (in reading order) in display order, left to right, as a line
+  // of a paragraph of the given direction.
+  Result<Text> visual_order(Direction paragraph = Direction::from_text) const {
+    return reordered(handle()->NLSVisualOrderFormat, paragraph);
+  }
+  // A reading order that displays as this line (in display order).
+  Result<Text> logical_order(Direction paragraph = Direction::from_text) const {
+    return reordered(handle()->NLSLogicalOrderFormat, paragraph);
+  }
+
   // ---- Into a room of fixed size ----------------------------------------------------
 
   // The text moved, in whole characters, into a field of `room` bytes;
@@ -850,6 +874,16 @@ class Text {
                   return call<decltype(&NLSStringTransliterateS_SBCS)>(
                       slot, data(), byte_length(), to, toLength, from, fromLength, std::int64_t{0},
                       dst, room, written, std::int64_t{0});
+                });
+  }
+  // Replaced ill-formed input and mirror images may change the length:
+  // room for the worst, a byte becoming four.
+  Result<Text> reordered(NLSSlot slot, Direction paragraph) const {
+    return made(byte_length() + 16, 4 * byte_length() + 16,
+                [&](std::uint8_t *dst, std::int64_t room, std::int64_t *written) {
+                  auto direction = static_cast<std::uint8_t>(paragraph);
+                  return call<decltype(&NLSVisualOrderFormat_SBCS)>(slot, data(), byte_length(),
+                                                                    dst, room, written, &direction);
                 });
   }
   template <typename... More>

@@ -176,3 +176,18 @@ TEST(CxxStatuses, MixedEncodingsAndEmptySlotsAnswerStatuses) {
 }
 
 }  // namespace
+
+TEST(CxxBidi, DirectionAndOrderInEveryUnicodeForm) {
+  for (const char *name : {"UTF-8", "UTF-16LE", "UTF-32BE"}) {
+    SCOPED_TRACE(name);
+    const auto enc = *host().encoding(name);
+    const auto rtl = *nlssm::Text::from_utf8(enc, "אבג abc");
+    EXPECT_EQ(rtl.base_direction().value_or(nlssm::Direction::from_text),
+              nlssm::Direction::right_to_left);
+    const auto shown = rtl.visual_order();
+    ASSERT_TRUE(shown) << shown.status().name();
+    EXPECT_EQ(shown->to_utf8().value_or(""), "abc גבא");
+    EXPECT_EQ(shown->logical_order(nlssm::Direction::right_to_left)->to_utf8().value_or(""),
+              "אבג abc");
+  }
+}
