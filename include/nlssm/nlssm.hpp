@@ -210,6 +210,7 @@ inline constexpr std::int32_t kUpper = 0x01, kLower = 0x02, kDigit = 0x04, kSpac
 // Converts whole text between two encodings through the host NLS object.
 inline Result<std::vector<std::uint8_t>> convert(void *nls, std::int64_t from, std::int64_t to,
                                                  std::span<const std::uint8_t> text) {
+  if (nls == nullptr) return Status(NLSSM_E_ENCODING);
   using Between = NLSHostConverterBetweenFn;
   void *converter = reinterpret_cast<Between>(
       NLSSM_HOST_SLOT(nls, NLSHOST_SLOT_NLS_CONVERTER_BETWEEN))(nls, from, to, nullptr, nullptr);
@@ -239,14 +240,17 @@ class Encoding {
  public:
   Encoding() = default;
   explicit Encoding(const NLSSMHandle *handle) : handle_(handle) {}
-  const NLSSMHandle *handle() const { return handle_; }
-  int number() const { return static_cast<int>(handle_->encodingNumber); }
+  // The handle; an Encoding made without one has a handle with every slot
+  // empty, so that its operations answer NLSSM_E_UNSUPPORTED.
+  const NLSSMHandle *handle() const { return handle_ != nullptr ? handle_ : &kNoHandle; }
+  int number() const { return static_cast<int>(handle()->encodingNumber); }
   // 0 SBCS, 1 UTF-8/UTF-EBCDIC, 2 WCS2, 3 WCS4, 4 MBCS modal, 5 MBCS non-modal.
-  int encoding_class() const { return static_cast<int>(handle_->encodingClass); }
-  int unit_width() const { return static_cast<int>(handle_->unitWidth); }
+  int encoding_class() const { return static_cast<int>(handle()->encodingClass); }
+  int unit_width() const { return static_cast<int>(handle()->unitWidth); }
   bool operator==(const Encoding &other) const { return handle_ == other.handle_; }
 
  private:
+  static constexpr NLSSMHandle kNoHandle{};
   const NLSSMHandle *handle_ = nullptr;
 };
 
@@ -599,6 +603,7 @@ class Text {
   // start, NLSSM_E_BAD_ARGUMENT.
   Result<Text> substr(std::int64_t start, std::int64_t count = -1) const {
     if (start < 0) return Status(NLSSM_E_BAD_ARGUMENT);
+    if (handle()->NLSStringSubStr == nullptr) return Status(NLSSM_E_UNSUPPORTED);
     bool placed = false;
     const NLSString source = at(start, &placed);
     if (!placed || count == 0) return Text(encoding_, std::vector<std::uint8_t>{});

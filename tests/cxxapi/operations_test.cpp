@@ -173,6 +173,11 @@ TEST(CxxStatuses, MixedEncodingsAndEmptySlotsAnswerStatuses) {
   const auto utfe = *nlssm::Text::from_utf8(*host().encoding("UTF-EBCDIC"), "ab");
   EXPECT_EQ(utfe.equals(utfe).status().code(), NLSSM_E_UNSUPPORTED);
   EXPECT_EQ(ascii.substr(-1).status().code(), NLSSM_E_BAD_ARGUMENT);
+  // Text over an encoding without a handle answers instead of crashing.
+  const nlssm::Text orphan(nlssm::Encoding{}, std::vector<uint8_t>{0x41});
+  EXPECT_EQ(orphan.index(orphan).status().code(), NLSSM_E_UNSUPPORTED);
+  EXPECT_EQ(orphan.substr(0).status().code(), NLSSM_E_UNSUPPORTED);
+  EXPECT_EQ(orphan.to_utf8().status().code(), NLSSM_E_ENCODING);
 }
 
 }  // namespace
