@@ -328,8 +328,6 @@ enum class Direction : std::uint8_t { left_to_right = 0, right_to_left = 1, from
 // Where justify puts the text of a field between its blanks.
 enum class Align : char { left = 'L', right = 'R', centre = 'C', none = 'N' };
 
-class Text;
-
 // A text written into a room of fixed size: what was written, and whether
 // all of the source fitted.
 struct Fitted;
