@@ -1,10 +1,12 @@
 // Fixed-length EBCDIC records with the C++ layer: each 36-byte record of
 // code page 037 holds a name (16 bytes), a city (12) and an amount (8), as a
 // mainframe data set would. The program builds the records, then reads them
-// back field by field: finds the records of one city whatever the case,
-// sums the amounts, and prints the total formatted in the same code page.
+// back field by field: orders them by name, finds the records of one city
+// whatever the case, sums their amounts, and prints the total formatted in
+// the same code page.
 #include <nlssm/nlssm.hpp>
 
+#include <algorithm>
 #include <cstdio>
 #include <vector>
 
@@ -44,6 +46,11 @@ int main() {
     if (!record) return 1;
     records.push_back(*record);
   }
+
+  // In order of the names (the first field), as the code page orders bytes.
+  std::sort(records.begin(), records.end(), [](const nlssm::Text &a, const nlssm::Text &b) {
+    return a.compare(b).value_or(nlssm::Order{}).sign < 0;
+  });
 
   auto wanted = nlssm::Text::from_utf8(*ebcdic, "Zürich");
   if (!wanted) return 1;
