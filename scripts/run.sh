@@ -18,3 +18,4 @@ for encoding in 20 24 134 205; do
 done
 echo "-- EBCDIC code page 037 (78)"
 "$nlsstr" count 78 --text "Grüße aus Köln"
+"$nlsstr" upper 78 --text "Grüße aus Köln"

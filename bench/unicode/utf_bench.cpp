@@ -15,22 +15,33 @@
 namespace {
 
 // Kinds of text: 0 ASCII, 1 European (about 1 in 12 characters non-ASCII),
-// 2 mixed scripts (Cyrillic, CJK, an emoji now and then, ASCII spaces).
+// 2 mixed scripts (Cyrillic, CJK, an emoji now and then, ASCII spaces),
+// 3 CJK (with a little ASCII punctuation), 4 emoji-mixed (ASCII words,
+// emoji, Cyrillic and CJK).
 std::vector<uint32_t> make_text(int kind, size_t chars) {
   std::mt19937 rng(12345);
   std::vector<uint32_t> text;
   text.reserve(chars);
+  auto ascii = [&] { return rng() % 7 == 0 ? uint32_t{' '} : uint32_t('a' + rng() % 26); };
   while (text.size() < chars) {
     const unsigned r = rng() % 100;
     uint32_t c;
-    if (kind == 0 || (kind == 1 && r < 92) || (kind == 2 && r < 25))
-      c = r % 7 == 0 ? ' ' : 'a' + rng() % 26;
-    else if (kind == 1 || r < 50)
+    if (kind == 3) {
+      c = r < 5 ? uint32_t{','} : 0x4E00 + rng() % 0x5000;
+    } else if (kind == 4) {
+      c = r < 40   ? ascii()
+          : r < 70 ? 0x1F300 + rng() % 0x300
+          : r < 85 ? 0x410 + rng() % 64
+                   : 0x4E00 + rng() % 0x5000;
+    } else if (kind == 0 || (kind == 1 && r < 92) || (kind == 2 && r < 25)) {
+      c = ascii();
+    } else if (kind == 1 || r < 50) {
       c = kind == 1 ? 0xC0 + rng() % 64 : 0x410 + rng() % 64;
-    else if (r < 97)
+    } else if (r < 97) {
       c = 0x4E00 + rng() % 0x5000;
-    else
+    } else {
       c = 0x1F600 + rng() % 64;
+    }
     text.push_back(c);
   }
   return text;
@@ -56,12 +67,12 @@ struct Corpus {
 };
 
 const Corpus &corpus(int kind) {
-  static const Corpus corpora[3] = {Corpus(0), Corpus(1), Corpus(2)};
+  static const Corpus corpora[5] = {Corpus(0), Corpus(1), Corpus(2), Corpus(3), Corpus(4)};
   return corpora[kind];
 }
 
 void label(benchmark::State &state, const Corpus &c) {
-  static const char *names[] = {"ascii", "european", "mixed"};
+  static const char *names[] = {"ascii", "european", "mixed", "cjk", "emoji-mixed"};
   state.SetLabel(names[state.range(0)]);
   state.SetBytesProcessed(state.iterations() * c.utf8.size());
   state.counters["chars/s"] =
@@ -158,10 +169,10 @@ int64_t icu_u8_length(const uint32_t *chars, int64_t count) {
 
 }  // namespace
 
-BENCHMARK(BM_ConvertToUTF32)->DenseRange(0, 2);
-BENCHMARK(BM_ConvertToUTF32_generic)->DenseRange(0, 2);
-BENCHMARK(BM_ICU_ucnv_convertEx)->DenseRange(0, 2);
-BENCHMARK(BM_ICU_u_strFromUTF8_ToUTF32)->DenseRange(0, 2);
+BENCHMARK(BM_ConvertToUTF32)->DenseRange(0, 4);
+BENCHMARK(BM_ConvertToUTF32_generic)->DenseRange(0, 4);
+BENCHMARK(BM_ICU_ucnv_convertEx)->DenseRange(0, 4);
+BENCHMARK(BM_ICU_u_strFromUTF8_ToUTF32)->DenseRange(0, 4);
 BENCHMARK(BM_Utf8Length<GET_UTF8_LEN_FROM_QVCHAR>)->DenseRange(0, 2);
 BENCHMARK(BM_Utf8Length<nlssm::unicode::utf8_length_scalar>)->DenseRange(0, 2);
 BENCHMARK(BM_Utf8Length<nlssm::unicode::utf8_length_sse2>)->DenseRange(0, 2);

@@ -1052,6 +1052,279 @@ NLSSM_API int64_t qvzsu8Find(const uint8_t *text, int64_t byteLength, const uint
                              int64_t patternLength);
 
 /* ---- Case mapping and normalization --------------------------------------- */
+/* NLSStringLower and NLSStringUpper map text to lower or upper case in place
+ * and return a status: 0 (also when there is nothing to do) or one of:
+ * NLSSM_E_BAD_OPTIONS (options above 7: UTF-EBCDIC, EUC-TW and GB18030
+ * members), NLSSM_E_NULL_ARGUMENT (null descriptor, or null buffer with a
+ * non-zero length). Options: bit 4 also maps double-byte characters through
+ * the handle's double-byte case table (multi-byte members); the other bits do
+ * nothing here.
+ * - plain form: from the descriptor's current character, at most `count`
+ *   characters (0 or negative: to `length`); nothing for an empty text or
+ *   no current character;
+ * - S form: the whole buffer of `byteLength` bytes (0 or negative: nothing);
+ * - C form: exactly `count` characters from the start of the buffer (0 or
+ *   negative: nothing); no byte limit is checked, so the caller vouches for
+ *   the characters (single byte: `count` bytes).
+ * Single-byte text goes through the case table; byte-table multi-byte text
+ * through it for single bytes; Unicode text through the host's
+ * character-information query. UTF-8 members keep the text's byte length: a
+ * shorter mapping moves the rest down and blanks (0x20) the freed bytes at
+ * the end (not in the C form); a longer one moves it up, and a character
+ * whose mapping would run past the end of the text ends the walk. A byte
+ * sequence that does not decode ends the walk with status 0. UTF-EBCDIC
+ * members map in place, the new form's length being the step; a mapping
+ * that would run past the end leaves its character; NLSStringUpper_UTFE
+ * ignores the count. */
+NLSSM_API int64_t NLSStringLower_SBCS(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_SBCS(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                               int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, NLSString *string,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringLower_WCS2L(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS2L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_WCS2L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringLower_WCS2B(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS2B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_WCS2B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringLower_WCS4L(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS4L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_WCS4L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringLower_WCS4B(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_WCS4B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_WCS4B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringLower_UTF8(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_UTF8(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringLowerC_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringLower_UTFE(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringLowerS_UTFE(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_SBCS(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_SBCS(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_SBCS(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal(const NLSSMHandle *handle, NLSString *string,
+                                               int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal(const NLSSMHandle *handle, uint8_t *buffer,
+                                                int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, NLSString *string,
+                                                      int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle, uint8_t *buffer,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, NLSString *string,
+                                                       int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_nonmodal_GB18030(const NLSSMHandle *handle, uint8_t *buffer,
+                                                        int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_MBCS_modal(const NLSSMHandle *handle, NLSString *string,
+                                            int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_MBCS_modal(const NLSSMHandle *handle, uint8_t *buffer,
+                                             int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringUpper_WCS2L(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS2L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_WCS2L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringUpper_WCS2B(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS2B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_WCS2B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringUpper_WCS4L(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS4L(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_WCS4L(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringUpper_WCS4B(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_WCS4B(const NLSSMHandle *handle, uint8_t *buffer,
+                                        int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_WCS4B(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                        uint32_t options);
+NLSSM_API int64_t NLSStringUpper_UTF8(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_UTF8(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+NLSSM_API int64_t NLSStringUpperC_UTF8(const NLSSMHandle *handle, uint8_t *buffer, int64_t count,
+                                       uint32_t options);
+NLSSM_API int64_t NLSStringUpper_UTFE(const NLSSMHandle *handle, NLSString *string, int64_t count,
+                                      uint32_t options);
+NLSSM_API int64_t NLSStringUpperS_UTFE(const NLSSMHandle *handle, uint8_t *buffer,
+                                       int64_t byteLength, uint32_t options);
+
+/* NLSStringNormalize copies the source (from its current character, at most
+ * `count` characters, 0 = all) into the destination at its current offset
+ * (clamped to 0), mapped to upper case with option bit 2, else to lower case;
+ * option bit 4 maps double-byte characters too. Statuses: NLSSM_E_DEST_TOO_SMALL
+ * (capacity 0, or the copy was cut to the room: the part that fits is
+ * written and mapped), NLSSM_E_BAD_OPTIONS, NLSSM_E_NULL_ARGUMENT (null
+ * descriptor or buffer). Member differences:
+ * - _SBCS: grows the destination's length to cover the copy;
+ * - _MBCS_nonmodal: character by character while they fit; never reports
+ *   truncation and leaves the destination's length;
+ * - _MBCS_modal: nothing for an empty source or destination (length 0); first
+ *   brings the destination into the source's shift mode, copies the shift
+ *   sequences through, and sets the destination's length to the end of the
+ *   copy;
+ * - _WCS2L/B, _WCS4L/B, _UTFE, _MBCS_nonmodal_EUC_JP/_EUC_TW/_GB18030: refuse
+ *   options above 7 or with bits 1 and 2 both set (EUC-JP: any of bits 1, 2
+ *   and 4); copy, reposition the destination on its current character, then
+ *   run the handle's NLSStringUpper or NLSStringLower on it;
+ * - _UTF8: checks the options and runs the handle's NLSStringUpper or
+ *   NLSStringLower on the destination; the source is not read. */
+NLSSM_API int64_t NLSStringNormalize_SBCS(const NLSSMHandle *handle, const NLSString *source,
+                                          NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                   const NLSString *source, NLSString *destination,
+                                                   int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_modal(const NLSSMHandle *handle, const NLSString *source,
+                                                NLSString *destination, int64_t count,
+                                                uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_WCS2L(const NLSSMHandle *handle, const NLSString *source,
+                                           NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_WCS2B(const NLSSMHandle *handle, const NLSString *source,
+                                           NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_WCS4L(const NLSSMHandle *handle, const NLSString *source,
+                                           NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_WCS4B(const NLSSMHandle *handle, const NLSString *source,
+                                           NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_UTFE(const NLSSMHandle *handle, const NLSString *source,
+                                          NLSString *destination, int64_t count, uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                          const NLSString *source,
+                                                          NLSString *destination, int64_t count,
+                                                          uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                          const NLSString *source,
+                                                          NLSString *destination, int64_t count,
+                                                          uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                           const NLSString *source,
+                                                           NLSString *destination, int64_t count,
+                                                           uint32_t options);
+NLSSM_API int64_t NLSStringNormalize_UTF8(const NLSSMHandle *handle, const NLSString *source,
+                                          NLSString *destination, int64_t count, uint32_t options);
+/* NLSStringNormalizeS maps n = min(sourceBytes, capacity) bytes of the source
+ * into the destination (they must not overlap unless equal) and stores n
+ * through `written` (may be null); NLSSM_E_DEST_TOO_SMALL when the capacity is
+ * below the source length. _MBCS_modal starts single-byte, follows the
+ * source's shift sequences without copying them and stores nothing; a
+ * non-modal lead byte in the last position is copied unchanged. The generic
+ * members check options as above, copy, then run the handle's
+ * NLSStringUpperS or NLSStringLowerS on the n destination bytes. _UTF8 runs
+ * NLSStringUpperS or NLSStringLowerS on the destination over the source
+ * length (kept within the capacity), without copying, and stores the source
+ * length. */
+NLSSM_API int64_t NLSStringNormalizeS_SBCS(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceBytes, uint8_t *destination,
+                                           int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal(const NLSSMHandle *handle,
+                                                    const uint8_t *source, int64_t sourceBytes,
+                                                    uint8_t *destination, int64_t capacity,
+                                                    int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_modal(const NLSSMHandle *handle, const uint8_t *source,
+                                                 int64_t sourceBytes, uint8_t *destination,
+                                                 int64_t capacity, int64_t *written,
+                                                 uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_WCS2L(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_WCS2B(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_WCS4L(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_WCS4B(const NLSSMHandle *handle, const uint8_t *source,
+                                            int64_t sourceBytes, uint8_t *destination,
+                                            int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_UTFE(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceBytes, uint8_t *destination,
+                                           int64_t capacity, int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_EUC_JP(const NLSSMHandle *handle,
+                                                           const uint8_t *source,
+                                                           int64_t sourceBytes,
+                                                           uint8_t *destination, int64_t capacity,
+                                                           int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_EUC_TW(const NLSSMHandle *handle,
+                                                           const uint8_t *source,
+                                                           int64_t sourceBytes,
+                                                           uint8_t *destination, int64_t capacity,
+                                                           int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_MBCS_nonmodal_GB18030(const NLSSMHandle *handle,
+                                                            const uint8_t *source,
+                                                            int64_t sourceBytes,
+                                                            uint8_t *destination, int64_t capacity,
+                                                            int64_t *written, uint32_t options);
+NLSSM_API int64_t NLSStringNormalizeS_UTF8(const NLSSMHandle *handle, const uint8_t *source,
+                                           int64_t sourceBytes, uint8_t *destination,
+                                           int64_t capacity, int64_t *written, uint32_t options);
+
 
 /* ---- Equality, inequality and ordering comparison ------------------------- */
 /* Equality (slots 10, 52, 105). 1 when equal, else 0; every failure (a null

@@ -23,9 +23,10 @@
 namespace kernel::cpu {
 
 // Instruction sets a hot path may have a variant for, weakest first.
-enum class Isa : uint8_t { sse2, avx2 };
+// avx512vbmi: AVX-512 F and BW with the byte permutes (VBMI).
+enum class Isa : uint8_t { sse2, avx2, avx512vbmi };
 
-inline constexpr std::array<Isa, 2> kAllIsas{Isa::sse2, Isa::avx2};
+inline constexpr std::array<Isa, 3> kAllIsas{Isa::sse2, Isa::avx2, Isa::avx512vbmi};
 
 // True when this processor and operating system run code built for `isa`.
 // Detected once; safe to call from any thread at any time.
@@ -88,4 +89,17 @@ class Dispatch {
 #else
 #define NLSSM_TARGET_AVX2_BEGIN _Pragma("GCC push_options") _Pragma("GCC target(\"avx2\")")
 #define NLSSM_TARGET_AVX2_END _Pragma("GCC pop_options")
+#endif
+
+// The same for AVX-512 code with byte permutes.
+#if defined(__clang__)
+#define NLSSM_TARGET_AVX512VBMI_BEGIN \
+  _Pragma(                            \
+      "clang attribute push(__attribute__((target(\"avx512f,avx512bw,avx512vbmi\"))), \
+  apply_to = function)")
+#define NLSSM_TARGET_AVX512VBMI_END _Pragma("clang attribute pop")
+#else
+#define NLSSM_TARGET_AVX512VBMI_BEGIN \
+  _Pragma("GCC push_options") _Pragma("GCC target(\"avx512f,avx512bw,avx512vbmi\")")
+#define NLSSM_TARGET_AVX512VBMI_END _Pragma("GCC pop_options")
 #endif

@@ -9,6 +9,7 @@
 #include <cstring>
 
 #include "unicode/codec.hpp"
+#include "unicode/utf8_blocks.hpp"
 
 namespace nlssm::unicode {
 
@@ -137,7 +138,13 @@ template <Order O>
 void bulk_to_utf32(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, int64_t &consumed,
                    int64_t &chars) {
   int64_t i = consumed, k = chars;
+  const bool blocks = avx2_usable();
   while (k < limit && n - i >= 4) {
+    if (blocks && n - i >= 35) {
+      const int64_t before = i;
+      utf8_blocks_avx2(s, n, d, limit, kIsBig<O>, i, k);
+      if (i != before) continue;
+    }
     const uint32_t b = s[i];
     if (b < 0x80) {
       if (n - i >= 16 && limit - k >= 16) {

@@ -212,6 +212,52 @@ TEST_P(ToUtf32Driver, StopsAtLimitOrFailureAndCountsStoredCharacters) {
 INSTANTIATE_TEST_SUITE_P(KnownAndGeneric, ToUtf32Driver,
                          testing::Values(UTF8_UTF32, utf8_via_pointer));
 
+// The block path of the known decoder against the one-character loop, on
+// text that mixes characters of every length with the faults a block must
+// stop before: invalid leads, stray and missing continuation bytes, cuts.
+TEST(ToUtf32Driver, BlockPathMatchesTheCharacterLoopOnAnyText) {
+  std::mt19937 rng(20261122);
+  const std::vector<std::vector<uint8_t>> pieces = {{'a'},
+                                                    {'Z'},
+                                                    {0xC3, 0xA9},
+                                                    {0xD0, 0x96},
+                                                    {0xE6, 0x97, 0xA5},
+                                                    {0xED, 0xA0, 0x80},
+                                                    {0xE0, 0x80, 0x80},
+                                                    {0xF0, 0x9F, 0x98, 0x80},
+                                                    {0xF4, 0x90, 0x80, 0x80},
+                                                    {0x80},
+                                                    {0xC0, 0x80},
+                                                    {0xF8},
+                                                    {0xE6, 0x97},
+                                                    {0xE6, 'x', 'y'},
+                                                    {0xFF}};
+  for (int round = 0; round < 6000; ++round) {
+    std::vector<uint8_t> text;
+    const size_t target = rng() % 200;
+    const int faults = rng() % 4;  // 0: well-formed pieces only
+    while (text.size() < target) {
+      const size_t limit = faults == 0 ? 9 : pieces.size();
+      const auto &piece = pieces[rng() % limit];
+      // Runs of one piece give the blocks of a single shape.
+      const int repeat = rng() % 4 == 0 ? 1 + rng() % 24 : 1;
+      for (int r = 0; r < repeat; ++r) text.insert(text.end(), piece.begin(), piece.end());
+    }
+    const int64_t capacity = rng() % 3 == 0 ? int64_t(rng() % (4 * text.size() + 8)) : 4 * 256;
+    for (NLSUTFEncoder enc : {COPY_UTF32, COPY_UTF32_SWAP}) {
+      std::vector<uint8_t> fast(4 * 256 + 16, 0xEE), slow(4 * 256 + 16, 0xEE);
+      int64_t fastWritten = -1, slowWritten = -1;
+      const int64_t fastStatus = ConvertToUTF32(text.data(), text.size(), fast.data(), capacity,
+                                                &fastWritten, UTF8_UTF32, enc);
+      const int64_t slowStatus = ConvertToUTF32(text.data(), text.size(), slow.data(), capacity,
+                                                &slowWritten, utf8_via_pointer, enc);
+      ASSERT_EQ(fastStatus, slowStatus) << round;
+      ASSERT_EQ(fastWritten, slowWritten) << round;
+      ASSERT_EQ(fast, slow) << round;
+    }
+  }
+}
+
 TEST(FromUtf32Driver, StopsWhenTheCapacityIsUsedUp) {
   const uint32_t text[] = {'a', 0xE9, 'b'};
   uint8_t out[8];
