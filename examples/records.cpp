@@ -2,8 +2,8 @@
 // code page 037 holds a name (16 bytes), a city (12) and an amount (8), as a
 // mainframe data set would. The program builds the records, then reads them
 // back field by field: orders them by name, finds the records of one city
-// whatever the case, sums their amounts, and prints the total formatted in
-// the same code page.
+// whatever the case, shows their names in upper case, sums their amounts,
+// and prints the total formatted in the same code page.
 #include <nlssm/nlssm.hpp>
 
 #include <algorithm>
@@ -69,6 +69,7 @@ int main() {
     }
     total += *value;
     name->strip();
+    if (!name->upper()) return 1;
     const auto blank = name->find_literal(' ');
     std::printf("%s: surname from character %lld, amount %lld\n",
                 name->to_utf8().value_or("?").c_str(),

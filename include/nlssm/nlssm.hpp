@@ -3,7 +3,7 @@
 //   nlssm::Host host = nlssm::Host::start();          // the reference host
 //   auto ebcdic = host.encoding("IBM-037");            // Result<Encoding>
 //   auto t = nlssm::Text::from_utf8(*ebcdic, "Grüße"); // Result<Text>
-//   t->reverse();                                      // Status
+//   t->upper();                                        // Status
 //   std::string shown = t->to_utf8().value_or("?");
 //
 // Every operation answers a small typed result (a value or a status) and
@@ -16,7 +16,8 @@
 //
 // Shapes of the results:
 //   - operations that change the text in place (reverse, strip, justify,
-//     erase_chars) change the Text and answer a Status (or a count);
+//     erase_chars, upper, lower) change the Text and answer a Status (or a
+//     count);
 //   - operations that write a new text (substr, quoted, concat,
 //     transliterate, ...) answer Result<Text>. The destination is sized from
 //     the source (its bytes plus room for shift sequences); when the
@@ -325,6 +326,9 @@ constexpr CharClass operator|(CharClass a, CharClass b) {
 // character.
 enum class Direction : std::uint8_t { left_to_right = 0, right_to_left = 1, from_text = 2 };
 
+// The case a text is mapped to.
+enum class Case { upper, lower };
+
 // Where justify puts the text of a field between its blanks.
 enum class Align : char { left = 'L', right = 'R', centre = 'C', none = 'N' };
 
@@ -416,6 +420,44 @@ class Text {
     utf8.resize(static_cast<std::size_t>(written));
     if (encoding.number() == NLSSM_ENC_UTF8) return Text(encoding, std::move(utf8));
     return from_utf8(encoding, {reinterpret_cast<const char *>(utf8.data()), utf8.size()});
+  }
+
+  // ---- Case mapping -----------------------------------------------------------------
+  // `double_byte` also maps double-byte characters through the encoding's
+  // double-byte case table.
+
+  // Upper or lower case in place. The text keeps its byte length: in UTF-8
+  // a shorter mapping leaves blanks at the end, and a character whose
+  // mapping would run past the end is left as it is.
+  Status upper(bool double_byte = true) {
+    return status(call<decltype(&NLSStringUpperS_SBCS)>(handle()->NLSStringUpperS, data(),
+                                                        byte_length(), case_options(double_byte)));
+  }
+  Status lower(bool double_byte = true) {
+    return status(call<decltype(&NLSStringLowerS_SBCS)>(handle()->NLSStringLowerS, data(),
+                                                        byte_length(), case_options(double_byte)));
+  }
+  // A copy mapped to one case by the normalizing operation (as upper() or
+  // lower() would map it).
+  Result<Text> normalized(Case to = Case::upper, bool double_byte = true) const {
+    Text copy = *this;
+    // The modal normalizing operation leaves shift sequences out of what it
+    // writes, which would leave the copy's double-byte characters without
+    // their shifts: modal text is mapped in place instead.
+    if (encoding_.encoding_class() == NLSSM_CLASS_MBCS_MODAL) {
+      const Status done = to == Case::upper ? copy.upper(double_byte) : copy.lower(double_byte);
+      if (!done) return done;
+      return copy;
+    }
+    // The other members map a buffer onto itself when source and
+    // destination are the same, so the copy is mapped where it lies.
+    const std::uint32_t options = case_options(double_byte) | (to == Case::upper ? 2u : 0u);
+    std::int64_t written = 0;
+    const std::int64_t r = call<decltype(&NLSStringNormalizeS_SBCS)>(
+        handle()->NLSStringNormalizeS, copy.data(), byte_length(), copy.data(), byte_length(),
+        &written, options);
+    if (r != 0) return status(r);
+    return copy;
   }
 
   // ---- Comparison -------------------------------------------------------------------
@@ -795,6 +837,7 @@ class Text {
     return *r == yes;
   }
   static Status status(std::int64_t r) { return detail::status_of(r); }
+  static std::uint32_t case_options(bool double_byte) { return double_byte ? 4u : 0u; }
   bool same_encoding(const Text &other) const { return encoding_ == other.encoding_; }
   // The result of an operation that answers a status or a value.
   template <typename Judge>

@@ -14,10 +14,12 @@ nlssm::Host &host() {
   return h;
 }
 
-// An encoding and a character outside ASCII that it holds.
+// An encoding, a character outside ASCII that it holds, and that
+// character's upper case.
 struct Sample {
   const char *name;
   const char *wide;
+  const char *wide_upper;
 };
 
 class CxxOperations : public testing::TestWithParam<Sample> {
@@ -25,9 +27,10 @@ class CxxOperations : public testing::TestWithParam<Sample> {
   nlssm::Encoding enc() const { return *host().encoding(GetParam().name); }
   nlssm::Text text(const std::string &utf8) const { return *nlssm::Text::from_utf8(enc(), utf8); }
   // "A<wide>b" and friends, with the sample's own character.
-  std::string w(const std::string &pattern) const {
+  std::string w(const std::string &pattern, bool upper = false) const {
     std::string out;
-    for (char c : pattern) out += c == '*' ? std::string(GetParam().wide) : std::string(1, c);
+    for (char c : pattern)
+      out += c != '*' ? std::string(1, c) : upper ? GetParam().wide_upper : GetParam().wide;
     return out;
   }
   static std::string shown(const nlssm::Result<nlssm::Text> &t) {
@@ -87,6 +90,16 @@ TEST_P(CxxOperations, EditsInPlace) {
   EXPECT_EQ(kept.erase_literal("-").value_or(-1), kept.byte_length() - enc().unit_width());
   kept.strip();
   EXPECT_EQ(kept.to_utf8().value_or(""), "aac");
+}
+
+TEST_P(CxxOperations, MapsCaseInPlaceAndIntoCopies) {
+  auto t = text(w("ab*Cd"));
+  ASSERT_TRUE(t.upper());
+  EXPECT_EQ(t.to_utf8().value_or(""), w("AB*CD", true));
+  ASSERT_TRUE(t.lower());
+  EXPECT_EQ(t.to_utf8().value_or(""), w("ab*cd"));
+  EXPECT_EQ(shown(text(w("x*Y")).normalized()), w("X*Y", true));
+  EXPECT_EQ(shown(text(w("X*y", true)).normalized(nlssm::Case::lower)), w("x*y"));
 }
 
 TEST_P(CxxOperations, WritesNewTexts) {
@@ -151,18 +164,19 @@ TEST_P(CxxOperations, CodePointsRoundTrip) {
   EXPECT_EQ(nlssm::Text::from_code_points(enc(), *cps).value_or(text("")), t);
 }
 
-INSTANTIATE_TEST_SUITE_P(Classes, CxxOperations,
-                         testing::Values(Sample{"IBM-037", "é"}, Sample{"ISO-8859-1", "é"},
-                                         Sample{"UTF-8", "日"}, Sample{"UTF-16BE", "日"},
-                                         Sample{"UTF-16LE", "é"}, Sample{"UTF-32BE", "日"},
-                                         Sample{"IBM-939", "日"}, Sample{"Shift_JIS", "日"},
-                                         Sample{"EUC-JP", "日"}, Sample{"GB18030", "日"}),
-                         [](const auto &info) {
-                           std::string name = info.param.name;
-                           for (char &c : name)
-                             if (c == '-') c = '_';
-                           return name;
-                         });
+INSTANTIATE_TEST_SUITE_P(
+    Classes, CxxOperations,
+    testing::Values(Sample{"IBM-037", "é", "É"}, Sample{"ISO-8859-1", "é", "É"},
+                    Sample{"UTF-8", "日", "日"}, Sample{"UTF-16BE", "日", "日"},
+                    Sample{"UTF-16LE", "é", "É"}, Sample{"UTF-32BE", "ж", "Ж"},
+                    Sample{"IBM-939", "日", "日"}, Sample{"Shift_JIS", "日", "日"},
+                    Sample{"EUC-JP", "日", "日"}, Sample{"GB18030", "日", "日"}),
+    [](const auto &info) {
+      std::string name = info.param.name;
+      for (char &c : name)
+        if (c == '-') c = '_';
+      return name;
+    });
 
 TEST(CxxStatuses, MixedEncodingsAndEmptySlotsAnswerStatuses) {
   const auto ebcdic = *nlssm::Text::from_utf8(*host().encoding("IBM-037"), "ab");
@@ -195,4 +209,16 @@ TEST(CxxBidi, DirectionAndOrderInEveryUnicodeForm) {
     EXPECT_EQ(shown->logical_order(nlssm::Direction::right_to_left)->to_utf8().value_or(""),
               "אבג abc");
   }
+}
+
+TEST(CxxCase, DoubleByteLettersOnRequest) {
+  for (const char *name : {"IBM-939", "Shift_JIS", "EUC-JP", "GB18030", "UTF-8", "UTF-16BE"}) {
+    SCOPED_TRACE(name);
+    auto t = *nlssm::Text::from_utf8(*host().encoding(name), "ａb");
+    ASSERT_TRUE(t.upper());
+    EXPECT_EQ(t.to_utf8().value_or(""), "ＡB");
+  }
+  auto kept = *nlssm::Text::from_utf8(*host().encoding("Shift_JIS"), "ａb");
+  ASSERT_TRUE(kept.upper(false));
+  EXPECT_EQ(kept.to_utf8().value_or(""), "ａB");
 }
