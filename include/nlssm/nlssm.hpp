@@ -31,8 +31,9 @@
 //     the start of the text) or -1 when absent;
 //   - orderings answer Result<Order>: the sign and the byte offset at which
 //     the order was decided.
-// Literals (the *_literal operations) are bytes of the host's literal set
-// (encoding 62), converted into the text's encoding by the module.
+// Literals (the *_literal operations) are bytes of the host's literal set,
+// encoding 62 (windows-1252 on the reference host, so ASCII literals read
+// as written), converted into the text's encoding by the module.
 #pragma once
 
 #include <nlssm/host.h>
