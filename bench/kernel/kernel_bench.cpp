@@ -1,5 +1,7 @@
-// The kernel's hot paths against the C library and a plain byte loop, on a
-// buffer that fits the caches (64 KiB) and one that does not (64 MiB).
+// The kernel's hot paths against the C library and a plain byte loop, on
+// buffers that fit the first two cache levels (64 KiB), the last level
+// (4 MiB), and ones that do not fit at all (64 MiB, 256 MiB: copies and
+// fills; scans and case mapping at 64 MiB only).
 #include <benchmark/benchmark.h>
 
 #include <cstdlib>
@@ -70,7 +72,81 @@ void Set(benchmark::State &state) {
   state.SetBytesProcessed(state.iterations() * n);
 }
 
+// Compares two equal buffers, so the whole length is read.
+template <bool Kernel>
+void Compare(benchmark::State &state) {
+  const int64_t n = state.range(0);
+  Buffer a(n, 'c'), b(n + 1, 'c');
+  for (auto _ : state) {
+    if constexpr (Kernel)
+      benchmark::DoNotOptimize(skMemCmp(a.bytes.get(), b.bytes.get() + 1, n));
+    else
+      benchmark::DoNotOptimize(
+          std::memcmp(a.bytes.get(), b.bytes.get() + 1, static_cast<size_t>(n)));
+  }
+  state.SetBytesProcessed(state.iterations() * n);
+}
+
+// Copies between two buffers.
+template <bool Kernel>
+void Copy(benchmark::State &state) {
+  const int64_t n = state.range(0);
+  Buffer from(n, 'a'), to(n, 'b');
+  for (auto _ : state) {
+    if constexpr (Kernel)
+      skMemCpy(from.bytes.get(), to.bytes.get(), n);
+    else
+      std::memcpy(to.bytes.get(), from.bytes.get(), static_cast<size_t>(n));
+    benchmark::ClobberMemory();
+  }
+  state.SetBytesProcessed(state.iterations() * n);
+}
+
+// Moves within one buffer, 67 bytes up and back down in turn, as an insertion
+// or a deletion in the middle of a text does.
+template <bool Kernel>
+void Move(benchmark::State &state) {
+  const int64_t n = state.range(0);
+  constexpr int64_t shift = 67;
+  Buffer b(n + shift, 'm');
+  uint8_t *low = b.bytes.get(), *high = low + shift;
+  bool up = true;
+  for (auto _ : state) {
+    const uint8_t *from = up ? low : high;
+    uint8_t *to = up ? high : low;
+    if constexpr (Kernel)
+      skMemSCpy(from, to, n);
+    else
+      std::memmove(to, from, static_cast<size_t>(n));
+    up = !up;
+    benchmark::ClobberMemory();
+  }
+  state.SetBytesProcessed(state.iterations() * n);
+}
+
 constexpr int64_t kSmall = 64 << 10, kLarge = 64 << 20;
+constexpr int64_t kBlockSizes[] = {64 << 10, 4 << 20, 64 << 20, 256 << 20};
+
+// Block operations at every size; the large ones run a fixed number of
+// times so the run stays short.
+template <typename Fn>
+void block_pair(Fn kernel, Fn baseline, const char *kernel_name, const char *baseline_name) {
+  for (int64_t n : kBlockSizes) {
+    auto *k = benchmark::RegisterBenchmark(kernel_name, kernel)->Arg(n);
+    auto *b = benchmark::RegisterBenchmark(baseline_name, baseline)->Arg(n);
+    if (n > (4 << 20)) {
+      k->Iterations(n > kLarge ? 4 : 16);
+      b->Iterations(n > kLarge ? 4 : 16);
+    }
+  }
+}
+
+const bool kBlockBenchmarks = [] {
+  block_pair(&Copy<true>, &Copy<false>, "skMemCpy", "memcpy");
+  block_pair(&Move<true>, &Move<false>, "skMemSCpy_overlapping", "memmove");
+  block_pair(&Set<true>, &Set<false>, "skMemSet", "memset");
+  return true;
+}();
 
 #define NLSSM_BENCH_PAIR(name, kernel, baseline)                    \
   BENCHMARK(name<true>)->Name(kernel)->Arg(kSmall);                 \
@@ -80,7 +156,7 @@ constexpr int64_t kSmall = 64 << 10, kLarge = 64 << 20;
 
 NLSSM_BENCH_PAIR(Scan, "skMemScan", "memchr");
 NLSSM_BENCH_PAIR(Upper, "skStrUp", "byte_loop_upper");
-NLSSM_BENCH_PAIR(Set, "skMemSet", "memset");
+NLSSM_BENCH_PAIR(Compare, "skMemCmp", "memcmp");
 
 }  // namespace
 

@@ -33,6 +33,39 @@ inline constexpr std::array<Isa, 3> kAllIsas{Isa::sse2, Isa::avx2, Isa::avx512vb
 bool supports(Isa isa) noexcept;
 const char *name(Isa isa) noexcept;
 
+// The data caches one core sees, in bytes. `llc` is the whole last level,
+// which the cores sharing it compete for; on a processor with two levels it
+// is the second.
+struct Caches {
+  int64_t l1d;
+  int64_t l2;
+  int64_t llc;
+  int64_t line;
+};
+
+// Read from the processor's cache descriptors, else from the C library;
+// levels neither reports get typical sizes. Detected once, when the module
+// is loaded.
+const Caches &caches() noexcept;
+
+// True when the processor's string instructions (rep movsb, rep stosb) move
+// whole cache lines at a time (enhanced rep movsb/stosb).
+bool fast_string_ops() noexcept;
+
+// Block operations from these sizes on use the string instructions, where
+// the processor has fast ones (else never): a copy once its source and
+// destination no longer fit the first-level cache together, a fill once it
+// no longer fits the second level. Below, the vector loops are faster.
+int64_t string_copy_min() noexcept;
+int64_t string_fill_min() noexcept;
+
+// Block operations of at least this many bytes write with non-temporal
+// stores: their destination (and a copy's source besides) cannot stay in the
+// last-level cache, so storing through it would evict everything else and
+// first read every line it is about to replace.
+int64_t stream_copy_min() noexcept;
+int64_t stream_fill_min() noexcept;
+
 template <typename Table>
 struct Variant {
   Isa isa;

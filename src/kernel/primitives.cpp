@@ -13,6 +13,10 @@ namespace {
 // cost less than its call.
 constexpr int64_t kBlockCopyMin = 96;
 
+// Shorter compares are done eight bytes per step before the vector loop
+// would have been set up.
+constexpr int64_t kVectorCompareMin = 64;
+
 bool disjoint(const void *a, const void *b, int64_t n) {
   const auto x = reinterpret_cast<uintptr_t>(a), y = reinterpret_cast<uintptr_t>(b);
   const auto len = static_cast<uintptr_t>(n);
@@ -85,18 +89,22 @@ int64_t skMemTNot(uint32_t value, const uint32_t *buffer, int64_t length) {
 }
 
 void skMemSet(uint8_t *buffer, uint8_t value, int64_t length) {
-  if (buffer != nullptr && length > 0) kernel::hot().mem_set(buffer, value, length);
+  if (buffer != nullptr && length > 0) kernel::fill_bytes(buffer, value, length);
 }
 void skMemTSet(uint32_t *buffer, uint32_t value, int64_t length) {
-  if (buffer != nullptr && length > 0) kernel::hot().mem_tset(buffer, value, length);
+  if (buffer != nullptr && length > 0) kernel::fill_units(buffer, value, length);
 }
 
 int64_t skMemCmp(const uint8_t *a, const uint8_t *b, int64_t length) {
   if (length <= 0) return 0;
   if (int64_t order = kernel::scalar::null_order(a, b); order != 2) return order;
+  if (length >= kVectorCompareMin) {
+    const int64_t at = kernel::hot().mem_mismatch(a, b, length);
+    return at == length ? 0 : a[at] > b[at] ? 1 : -1;
+  }
+  int64_t i = 0;
   // Eight bytes per step; the lowest differing byte of the little-endian
   // words is the first differing byte of the buffers.
-  int64_t i = 0;
   for (; i + 8 <= length; i += 8) {
     uint64_t x, y;
     std::memcpy(&x, a + i, 8);
@@ -115,11 +123,12 @@ int64_t skWMemCmp(const uint32_t *a, const uint32_t *b, int64_t length) {
 
 void *skMemCpy(const void *source, void *destination, int64_t length) {
   if (source == nullptr || destination == nullptr || length <= 0) return destination;
-  if (length > kBlockCopyMin && disjoint(source, destination, length))
-    std::memcpy(destination, source, static_cast<size_t>(length));
+  const auto *s = static_cast<const uint8_t *>(source);
+  auto *d = static_cast<uint8_t *>(destination);
+  if (length > kBlockCopyMin && disjoint(s, d, length))
+    kernel::copy_disjoint(d, s, length);
   else
-    copy_pairs_up(static_cast<const uint8_t *>(source), static_cast<uint8_t *>(destination),
-                  length);
+    copy_pairs_up(s, d, length);
   return destination;
 }
 
@@ -128,13 +137,17 @@ void *skMemSCpy(const void *source, void *destination, int64_t length) {
     return destination;
   const auto *s = static_cast<const uint8_t *>(source);
   auto *d = static_cast<uint8_t *>(destination);
-  if (length > kBlockCopyMin)
-    disjoint(s, d, length) ? std::memcpy(d, s, static_cast<size_t>(length))
-                           : std::memmove(d, s, static_cast<size_t>(length));
-  else if (reinterpret_cast<uintptr_t>(d) < reinterpret_cast<uintptr_t>(s))
+  const bool upwards = reinterpret_cast<uintptr_t>(d) < reinterpret_cast<uintptr_t>(s);
+  if (length > kBlockCopyMin) {
+    if (disjoint(s, d, length))
+      kernel::copy_disjoint(d, s, length);
+    else
+      (upwards ? kernel::hot().copy_up : kernel::hot().copy_down)(d, s, length);
+  } else if (upwards) {
     copy_pairs_up(s, d, length);
-  else
+  } else {
     copy_pairs_down(s, d, length);
+  }
   return destination;
 }
 

@@ -23,7 +23,8 @@ struct V128 {
   NLSSM_VEC_FN Reg load(const void *p) { return _mm_load_si128(static_cast<const Reg *>(p)); }
   NLSSM_VEC_FN Reg loadu(const void *p) { return _mm_loadu_si128(static_cast<const Reg *>(p)); }
   NLSSM_VEC_FN void store(void *p, Reg v) { _mm_store_si128(static_cast<Reg *>(p), v); }
-  // Bypasses the caches: for fills much larger than they are.
+  NLSSM_VEC_FN void storeu(void *p, Reg v) { _mm_storeu_si128(static_cast<Reg *>(p), v); }
+  // Bypasses the caches: for blocks much larger than they are.
   NLSSM_VEC_FN void stream(void *p, Reg v) { _mm_stream_si128(static_cast<Reg *>(p), v); }
   NLSSM_VEC_FN void stream_fence() { _mm_sfence(); }
   template <typename T>
@@ -65,6 +66,7 @@ struct V256 {
   NLSSM_VEC_FN Reg load(const void *p) { return _mm256_load_si256(static_cast<const Reg *>(p)); }
   NLSSM_VEC_FN Reg loadu(const void *p) { return _mm256_loadu_si256(static_cast<const Reg *>(p)); }
   NLSSM_VEC_FN void store(void *p, Reg v) { _mm256_store_si256(static_cast<Reg *>(p), v); }
+  NLSSM_VEC_FN void storeu(void *p, Reg v) { _mm256_storeu_si256(static_cast<Reg *>(p), v); }
   NLSSM_VEC_FN void stream(void *p, Reg v) { _mm256_stream_si256(static_cast<Reg *>(p), v); }
   NLSSM_VEC_FN void stream_fence() { _mm_sfence(); }
   template <typename T>

@@ -6,6 +6,7 @@
 #include <array>
 #include <random>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "kernel/hot.hpp"
@@ -24,9 +25,11 @@ std::vector<Path> paths() {
   for (const auto &variant : kernel::hot_ops.variants())
     if (kernel::cpu::supports(variant.isa))
       out.push_back({kernel::cpu::name(variant.isa), *variant.table});
-  out.push_back(
-      {"exported", {skStrUp, skStrLow, skMemSet, skMemTSet, skMemScan, skMemNScan, skMemTNScan,
-                    kernel::scalar::mem_mismatch}});
+  // The exported fills serve both fill entries; the exported copies are
+  // checked in block_copy_test.cpp.
+  out.push_back({"exported",
+                 {skStrUp, skStrLow, skMemSet, skMemTSet, skMemScan, skMemNScan, skMemTNScan,
+                  kernel::scalar::mem_mismatch, skMemSet, skMemTSet, nullptr, nullptr, nullptr}});
   return out;
 }
 
@@ -86,14 +89,18 @@ TEST_P(HotPathTest, CaseMappingChangesAsciiLettersOnly) {
 
 TEST_P(HotPathTest, FillsWriteExactlyTheRange) {
   const auto &ops = GetParam().ops;
-  sweep<uint8_t>([&](uint8_t *p, int64_t n, uint8_t *e) {
-    ops.mem_set(p, 0x5a, n);
-    kernel::scalar::mem_set(e, 0x5a, n);
-  });
-  sweep<uint32_t>([&](uint32_t *p, int64_t n, uint32_t *e) {
-    ops.mem_tset(p, 0xdeadbeef, n);
-    kernel::scalar::mem_tset(e, 0xdeadbeef, n);
-  });
+  // Through the caches and around them.
+  for (auto [set, tset] :
+       {std::pair{ops.mem_set, ops.mem_tset}, std::pair{ops.mem_stream_set, ops.mem_stream_tset}}) {
+    sweep<uint8_t>([&](uint8_t *p, int64_t n, uint8_t *e) {
+      set(p, 0x5a, n);
+      kernel::scalar::mem_set(e, 0x5a, n);
+    });
+    sweep<uint32_t>([&](uint32_t *p, int64_t n, uint32_t *e) {
+      tset(p, 0xdeadbeef, n);
+      kernel::scalar::mem_tset(e, 0xdeadbeef, n);
+    });
+  }
 }
 
 TEST_P(HotPathTest, ScansFindTheFirstHitInsideTheRange) {
@@ -105,6 +112,32 @@ TEST_P(HotPathTest, ScansFindTheFirstHitInsideTheRange) {
   check_find<uint32_t>(
       [&](const uint32_t *p, int64_t n) { return ops.mem_tnscan(p, n, 0x00200020); }, 0x00200020,
       0x80200020);
+}
+
+// The first difference at every length and alignment, with differing bytes
+// just outside the range so that reading past it gives a wrong answer.
+TEST_P(HotPathTest, MismatchFindsTheFirstDifferenceInsideTheRange) {
+  const auto &ops = GetParam().ops;
+  alignas(64) std::array<uint8_t, 64 + kMaxLength + 64> a, b;
+  std::mt19937 rng(77);
+  for (int64_t n = 0; n <= kMaxLength; ++n) {
+    for (int64_t shift = 0; shift < 64; ++shift) {
+      for (auto &x : a) x = static_cast<uint8_t>(rng());
+      for (auto &x : b) x = static_cast<uint8_t>(rng());
+      uint8_t *pa = a.data() + shift, *pb = b.data() + 1 + (shift * 5 + n) % 63;
+      std::copy(pa, pa + n, pb);
+      pb[n] = static_cast<uint8_t>(pa[n] ^ 1);
+      ASSERT_EQ(ops.mem_mismatch(pa, pb, n), n) << "length " << n << ", shift " << shift;
+      if (n == 0) continue;
+      for (int64_t at : {int64_t{0}, n - 1, n / 2, (n * 13 + shift) % n}) {
+        pb[at] ^= 0x80;
+        if (at + 1 < n) pb[at + 1] ^= 0x01;  // later differences do not count
+        ASSERT_EQ(ops.mem_mismatch(pa, pb, n), at) << "length " << n << ", shift " << shift;
+        pb[at] ^= 0x80;
+        if (at + 1 < n) pb[at + 1] ^= 0x01;
+      }
+    }
+  }
 }
 
 INSTANTIATE_TEST_SUITE_P(Kernel, HotPathTest, testing::ValuesIn(paths()),
