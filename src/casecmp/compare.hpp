@@ -153,21 +153,7 @@ int64_t bytes_of_chars(const M &m, const uint8_t *p, int64_t n, int64_t count,
 
 // Non-modal multi-byte sets: lead and trail bytes from the handle, or the
 // fixed length rules of EUC-JP, EUC-TW and GB18030 chosen by encoding number.
-template <class F>
-auto with_nonmodal_model(const NLSSMHandle *h, F run) {
-  switch (h->encodingNumber) {
-    case NLSSM_ENC_EUC_JP:
-      return run(cursor::EucJpModel(h));
-    case 119:
-    case 120:
-    case 159:
-      return run(cursor::EucTwModel(h));
-    case NLSSM_ENC_GB18030:
-      return run(cursor::Gb18030Model(h));
-    default:
-      return run(cursor::DbcsModel(h));
-  }
-}
+using cursor::with_nonmodal_model;
 
 // ---- Unicode decoding and case queries -------------------------------------------
 

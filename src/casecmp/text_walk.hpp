@@ -137,18 +137,7 @@ decltype(auto) with_wcs2_model(const NLSSMHandle *h, Fn &&fn) {
 
 template <class Fn>
 decltype(auto) with_dbcs_model(const NLSSMHandle *h, Fn &&fn) {
-  switch (h->encodingNumber) {
-    case NLSSM_ENC_EUC_JP:
-      return fn(cursor::EucJpModel(h));
-    case 119:
-    case 120:
-    case 159:
-      return fn(cursor::EucTwModel(h));
-    case NLSSM_ENC_GB18030:
-      return fn(cursor::Gb18030Model(h));
-    default:
-      return fn(cursor::DbcsModel(h));
-  }
+  return cursor::with_nonmodal_model(h, fn);
 }
 
 // The model type a dispatcher hands to its function.

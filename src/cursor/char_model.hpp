@@ -274,4 +274,23 @@ struct ModalModel {
   }
 };
 
+// Calls fn with the character model of a non-modal multi-byte handle: the
+// fixed length rules of EUC-JP, EUC-TW (119, 120, 159) and GB18030 by
+// encoding number, the handle's lead and trail flags for every other set.
+template <class Fn>
+decltype(auto) with_nonmodal_model(const NLSSMHandle *h, Fn &&fn) {
+  switch (h->encodingNumber) {
+    case NLSSM_ENC_EUC_JP:
+      return fn(EucJpModel(h));
+    case 119:
+    case 120:
+    case 159:
+      return fn(EucTwModel(h));
+    case NLSSM_ENC_GB18030:
+      return fn(Gb18030Model(h));
+    default:
+      return fn(DbcsModel(h));
+  }
+}
+
 }  // namespace nlssm::cursor

@@ -33,17 +33,9 @@ decltype(auto) with_multibyte_model(const NLSSMHandle *h, Fn &&fn) {
   switch (h->encodingNumber) {
     case NLSSM_ENC_UTF8:
       return fn(cursor::Utf8StepModel(h));
-    case NLSSM_ENC_EUC_JP:
-      return fn(cursor::EucJpModel(h));
-    case 119:
-    case 120:
-    case 159:
-      return fn(cursor::EucTwModel(h));
-    case NLSSM_ENC_GB18030:
-      return fn(cursor::Gb18030Model(h));
     default:
       if (h->encodingClass == NLSSM_CLASS_UTF8) return fn(UtfeStepModel(h));
-      return fn(cursor::DbcsModel(h));
+      return cursor::with_nonmodal_model(h, fn);
   }
 }
 

@@ -156,18 +156,8 @@ struct Wcs4Class {
 struct DbcsClass {
   template <class Fn>
   static auto visit(const NLSSMHandle *h, Fn &&fn) {
-    switch (h->encodingNumber) {
-      case NLSSM_ENC_EUC_JP:
-        return fn(NonModalChars<cursor::EucJpModel>(h));
-      case 119:
-      case 120:
-      case 159:  // EUC-TW
-        return fn(NonModalChars<cursor::EucTwModel>(h));
-      case NLSSM_ENC_GB18030:
-        return fn(NonModalChars<cursor::Gb18030Model>(h));
-      default:
-        return fn(NonModalChars<cursor::DbcsModel>(h));
-    }
+    return cursor::with_nonmodal_model(
+        h, [&](auto model) { return fn(NonModalChars<decltype(model)>(h)); });
   }
 };
 struct ModalClass {

@@ -5,6 +5,7 @@
 #include <nlssm/nlssm.h>
 #include <unicode/uchar.h>
 #include <nlssm/reference_host.hpp>
+#include "reference_handles.hpp"
 
 #include <cstdint>
 #include <string>
@@ -16,15 +17,8 @@ namespace bidi_test {
 
 using Bytes = std::vector<uint8_t>;
 
-inline nlssm::refhost::ReferenceHost &host() {
-  static auto started = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
-  return *started;
-}
-
-inline const NLSSMHandle *handle(int encoding) {
-  NLSSMHandle *h = nullptr;
-  return host().create_handle(encoding, &h) == 0 ? h : nullptr;
-}
+using test_support::handle;
+using test_support::host;
 
 using Reorder = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, uint8_t *, int64_t,
                             int64_t *, uint8_t *);

@@ -4,6 +4,7 @@
 
 #include <nlssm/nlssm.h>
 #include <nlssm/reference_host.hpp>
+#include "reference_handles.hpp"
 
 #include <cstdint>
 #include <vector>
@@ -12,11 +13,7 @@ namespace case_test {
 
 using Bytes = std::vector<uint8_t>;
 
-inline const NLSSMHandle *handle(int encoding) {
-  static auto host = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
-  NLSSMHandle *h = nullptr;
-  return host->create_handle(encoding, &h) == 0 ? h : nullptr;
-}
+using test_support::handle;
 
 // A descriptor over `text`, positioned at byte `offset` with kind `kind`.
 inline NLSString over(Bytes &text, int64_t offset = 0, uint32_t kind = NLSSM_KIND_SINGLE) {

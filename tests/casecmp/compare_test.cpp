@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 #include <nlssm/nlssm.h>
 #include <nlssm/reference_host.hpp>
+#include "reference_handles.hpp"
 
 #include <climits>
 #include <ostream>
@@ -35,14 +36,8 @@ using LitS = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, const ui
 using CompLit = int64_t (*)(const NLSSMHandle *, const NLSString *, const uint8_t *, int64_t,
                             uint32_t);
 
-nlssm::refhost::ReferenceHost &host() {
-  static auto h = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
-  return *h;
-}
-const NLSSMHandle *handle(int encoding) {
-  NLSSMHandle *h = nullptr;
-  return host().create_handle(encoding, &h) == 0 ? h : nullptr;
-}
+using test_support::handle;
+using test_support::host;
 
 // Text in the handle's encoding, converted from UTF-32 host characters.
 Bytes encode(const NLSSMHandle *h, const std::u32string &text) {

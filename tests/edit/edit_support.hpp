@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 #include <nlssm/nlssm.h>
 #include <nlssm/reference_host.hpp>
+#include "reference_handles.hpp"
 
 #include <cstdint>
 #include <cstring>
@@ -18,15 +19,8 @@ namespace edit_test {
 using Bytes = std::vector<uint8_t>;
 using nlssm::refhost::PoolRegistry;
 
-inline nlssm::refhost::ReferenceHost &host() {
-  static auto started = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
-  return *started;
-}
-
-inline const NLSSMHandle *handle(int encoding) {
-  NLSSMHandle *h = nullptr;
-  return host().create_handle(encoding, &h) == 0 ? h : nullptr;
-}
+using test_support::handle;
+using test_support::host;
 
 // The prototypes of the operations, for calls through their slots.
 using ReverseS = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t);

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 #include <nlssm/nlssm.h>
 #include <nlssm/reference_host.hpp>
+#include "reference_handles.hpp"
 
 #include <algorithm>
 #include <cstdint>
@@ -13,16 +14,8 @@
 
 namespace editmove_test {
 
-inline nlssm::refhost::ReferenceHost &host() {
-  static auto started = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
-  return *started;
-}
-
-inline const NLSSMHandle *handle(int encoding) {
-  NLSSMHandle *h = nullptr;
-  EXPECT_EQ(host().create_handle(encoding, &h), 0) << encoding;
-  return h;
-}
+using test_support::handle;
+using test_support::host;
 
 template <typename Fn>
 Fn slot(NLSSlot s) {

@@ -5,6 +5,7 @@
 #include <nlssm/host.h>
 #include <nlssm/nlssm.h>
 #include <nlssm/reference_host.hpp>
+#include "reference_handles.hpp"
 
 #include <cstdint>
 #include <cstring>
@@ -14,15 +15,8 @@ namespace numtest {
 
 // One host for the whole test program: the module keeps the host's service
 // object in a global.
-inline nlssm::refhost::ReferenceHost &host() {
-  static auto host = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
-  return *host;
-}
-
-inline const NLSSMHandle *handle(int encoding) {
-  NLSSMHandle *h = nullptr;
-  return host().create_handle(encoding, &h) == 0 ? h : nullptr;
-}
+using test_support::handle;
+using test_support::host;
 
 // SBCS ASCII and EBCDIC, UTF-8, UTF-EBCDIC, UTF-16 BE and LE, UTF-32 BE, the
 // host's characters, EUC-JP (non-modal) and IBM-937 (modal EBCDIC).

@@ -8,12 +8,6 @@
 
 namespace search_test {
 
-const NLSSMHandle *handle(int encoding) {
-  static auto host = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
-  NLSSMHandle *h = nullptr;
-  return host->create_handle(encoding, &h) == 0 ? h : nullptr;
-}
-
 Bytes encode(int encoding, const std::u32string &text) {
   const auto *info = nlssm::refhost::ReferenceHost::registry().find(encoding);
   if (info->converter == "builtin:utf-ebcdic") {  // ICU has none: the module's encoder

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <nlssm/nlssm.h>
+#include "reference_handles.hpp"
 
 #include <cstdint>
 #include <string>
@@ -12,7 +13,7 @@ namespace search_test {
 
 using Bytes = std::vector<uint8_t>;
 
-const NLSSMHandle *handle(int encoding);
+using test_support::handle;
 
 // `text` (code points) in `encoding`, as ICU converts it; modal text shifts
 // around each run of double-byte characters.

@@ -7,6 +7,7 @@
 #include <unicode/ucnv.h>
 #include <unicode/utf8.h>
 #include <nlssm/reference_host.hpp>
+#include "reference_handles.hpp"
 
 #include <cstring>
 #include <random>
@@ -21,15 +22,8 @@ using Bytes = std::string;
 constexpr int64_t kTooSmall = NLSSM_E_DEST_TOO_SMALL;
 constexpr int kUtfe = 161;
 
-ReferenceHost &host() {
-  static auto h = ReferenceHost::start(nlssm::refhost::linked_module());
-  return *h;
-}
-
-const NLSSMHandle *handle(int encoding) {
-  NLSSMHandle *h = nullptr;
-  return host().create_handle(encoding, &h) == 0 ? h : nullptr;
-}
+using test_support::handle;
+using test_support::host;
 
 const uint8_t *u(const Bytes &b) {
   return reinterpret_cast<const uint8_t *>(b.data());

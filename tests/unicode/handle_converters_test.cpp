@@ -7,6 +7,7 @@
 #include <unicode/utf16.h>
 #include <unicode/utf8.h>
 #include <nlssm/reference_host.hpp>
+#include "reference_handles.hpp"
 
 #include <algorithm>
 #include <cstring>
@@ -20,11 +21,7 @@ namespace {
 namespace u = nlssm::unicode;
 using SetPos = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t);
 
-const NLSSMHandle *handle(int encoding) {
-  static auto host = nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module());
-  NLSSMHandle *h = nullptr;
-  return host->create_handle(encoding, &h) == 0 ? h : nullptr;
-}
+using test_support::handle;
 
 bool untouched(const uint8_t *p, int64_t from, int64_t to = 8) {
   return std::all_of(p + from, p + to, [](uint8_t b) { return b == 0xEE; });
