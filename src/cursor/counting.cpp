@@ -622,7 +622,8 @@ extern "C" int64_t NLSStringNLength_WCS2(const NLSSMHandle *h, const uint8_t *te
   return wcs2_length(h, text, byteLimit, charCount, byteCount);
 }
 
-// A character counts only when its last byte lies inside the limit.
+// A character counts only when its last byte lies inside the limit and
+// before the terminating zero byte; no byte after that zero is read.
 extern "C" int64_t NLSStringNLength_UTF8(const NLSSMHandle *, const uint8_t *text,
                                          int64_t byteLimit, int64_t *charCount,
                                          int64_t *byteCount) {
@@ -634,7 +635,9 @@ extern "C" int64_t NLSStringNLength_UTF8(const NLSSMHandle *, const uint8_t *tex
   int64_t status = 0;
   while (off < byteLimit && text[off] != 0) {
     const int64_t size = kUtf8LeadLength[text[off]];
-    if (size == 0 || off + size > byteLimit) {
+    int64_t whole = 1;
+    while (whole < size && off + whole < byteLimit && text[off + whole] != 0) ++whole;
+    if (size == 0 || whole < size) {
       status = kBadCharacter;
       break;
     }

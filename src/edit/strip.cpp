@@ -212,9 +212,10 @@ struct ModalKept {
 };
 
 // Follows the shift sequences; in single-byte width the handle's blank byte
-// extends the run of trailing blanks, in double-byte width a lead byte
-// followed by a trail byte is one character. Stops after `limit`
-// characters (0: no limit).
+// extends the run of trailing blanks, in double-byte width two bytes are one
+// character (as the cursor steps modal text, so that the count agrees with
+// the characters a caller counted). Stops after `limit` characters (0: no
+// limit).
 ModalKept modal_walk_kept(const NLSSMHandle *h, const uint8_t *p, int64_t bytes, int64_t limit,
                           bool dbl) {
   const ModalModel m(h);
@@ -228,10 +229,7 @@ ModalKept modal_walk_kept(const NLSSMHandle *h, const uint8_t *p, int64_t bytes,
       if (run == 0) keep = off;
       continue;
     }
-    int64_t size = 1;
-    if (dbl && off + 2 <= bytes && (h->charClass[p[off]] & cursor::kLeadBit) != 0 &&
-        (h->charClass[p[off + 1]] & cursor::kTrailBit) != 0)
-      size = 2;
+    const int64_t size = dbl && off + 2 <= bytes ? 2 : 1;
     run = !dbl && p[off] == blank ? run + 1 : 0;
     ++chars;
     off += size;

@@ -63,7 +63,7 @@ bool has_cache_topology_leaf() noexcept {
   // Extended leaf 0x80000001, ECX bit 22: the topology extensions that
   // include leaf 0x8000001D.
   return __get_cpuid(0x80000001, &a, &b, &c, &d) != 0 && (c & (1u << 22)) != 0 &&
-         __get_cpuid_max(0x80000000, nullptr) >= 0x8000001D;
+         static_cast<unsigned>(__get_cpuid_max(0x80000000, nullptr)) >= 0x8000001Du;
 }
 
 Caches detect_caches() noexcept {

@@ -344,7 +344,7 @@ constexpr NarrowTable make_narrow_table(Family family, bool keepExponent) {
   for (const auto &k : kept)
     if (keepExponent || (k.c != 'E' && k.c != 'e'))
       t.bytes[static_cast<uint8_t>(k.c)] = ascii ? k.c : k.ebcdic;
-  t.bytes['\''] = ascii ? '\'' : kRowApostrophe;
+  t.bytes[static_cast<uint8_t>('\'')] = ascii ? '\'' : kRowApostrophe;
   t.bytes[0xA0] = kNoBreakSpace;
   return t;
 }

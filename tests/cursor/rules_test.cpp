@@ -246,6 +246,18 @@ INSTANTIATE_TEST_SUITE_P(
                       CountCase{Enc::kEucJp, {0xA1, 'a', 0x8E}, 0, 3, kBad},
                       CountCase{Enc::kGb18030, {0x81, 0x30, 0x81, 0x30, 0x81}, 0, 2, kBad}));
 
+// Found by fuzzing: the limited UTF-8 length stepped over the terminating
+// zero when it fell inside a character the lead byte announced, and read on
+// past the end of the text.
+TEST(Lengths, LimitedUtf8LengthStopsAtAZeroInsideACharacter) {
+  auto utf8 = make_handle(Enc::kUtf8);
+  const uint8_t text[] = {'a', 0xE2, 0x82, 0, 'b', 'c', 0};
+  int64_t chars = -1, bytes = -1;
+  EXPECT_EQ(string_nlength(&utf8->h, text, 40, &chars, &bytes), kBad);
+  EXPECT_EQ(chars, 1);
+  EXPECT_EQ(bytes, 1);
+}
+
 TEST(Lengths, TerminatedAndLimitedText) {
   auto utf8 = make_handle(Enc::kUtf8);
   const uint8_t text[] = {'a', 0xC3, 0xA9, 0xE2, 0x82, 0xAC, 0};

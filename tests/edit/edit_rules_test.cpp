@@ -154,6 +154,18 @@ TEST(EditRules, SubstringOfAllThatRemainsGoesThroughTheMove) {
   EXPECT_TRUE(guard_intact(dst, 8));
 }
 
+// Found by fuzzing: modal strip took a double-byte pair for one character
+// only when its bytes carried the lead and trail flags, so the C form could
+// answer more characters than it was given.
+TEST(EditRules, ModalStripCountsEveryDoubleBytePairAsOneCharacter) {
+  const NLSSMHandle *h = handle(kModal);
+  Bytes text{0xC1, SO, 0x3E, 0x3E, 0x01, 0x08, SI, 0x40};  // A, two pairs, a blank
+  EXPECT_EQ(call<StripS>(h, h->NLSStringStripC, text.data(), int64_t{4}, int64_t{0}), 3);
+  const NLSString s = at_char(h, text, text.size(), 0);
+  EXPECT_EQ(call<Strip>(h, h->NLSStringStrip, &s, int64_t{0}, int64_t{0}), 3);
+  EXPECT_EQ(call<StripS>(h, h->NLSStringStripS, text.data(), int64_t(text.size()), int64_t{0}), 7);
+}
+
 TEST(EditRules, StripKnowsOnlyTheEncodingsBlankAndTheseWhiteSpaceSequences) {
   const NLSSMHandle *e = handle(kEbcdic), *u = handle(kUtf8);
   const Bytes ebcdic{0xC1, 0x20, 0x40, 0x40};

@@ -244,12 +244,15 @@ TEST(ToUtf32Driver, BlockPathMatchesTheCharacterLoopOnAnyText) {
       for (int r = 0; r < repeat; ++r) text.insert(text.end(), piece.begin(), piece.end());
     }
     const int64_t capacity = rng() % 3 == 0 ? int64_t(rng() % (4 * text.size() + 8)) : 4 * 256;
+    // The decoder may read up to five bytes past the text's end.
+    const int64_t length = static_cast<int64_t>(text.size());
+    text.resize(text.size() + 5, 0);
     for (NLSUTFEncoder enc : {COPY_UTF32, COPY_UTF32_SWAP}) {
       std::vector<uint8_t> fast(4 * 256 + 16, 0xEE), slow(4 * 256 + 16, 0xEE);
       int64_t fastWritten = -1, slowWritten = -1;
-      const int64_t fastStatus = ConvertToUTF32(text.data(), text.size(), fast.data(), capacity,
-                                                &fastWritten, UTF8_UTF32, enc);
-      const int64_t slowStatus = ConvertToUTF32(text.data(), text.size(), slow.data(), capacity,
+      const int64_t fastStatus =
+          ConvertToUTF32(text.data(), length, fast.data(), capacity, &fastWritten, UTF8_UTF32, enc);
+      const int64_t slowStatus = ConvertToUTF32(text.data(), length, slow.data(), capacity,
                                                 &slowWritten, utf8_via_pointer, enc);
       ASSERT_EQ(fastStatus, slowStatus) << round;
       ASSERT_EQ(fastWritten, slowWritten) << round;
