@@ -5,13 +5,12 @@
 #include <cstring>
 
 #include "cursor/char_model.hpp"
+#include "module/out_value.hpp"
 
 namespace nlssm::cursor {
 namespace {
 
-void store(int64_t *where, int64_t value) {
-  if (where != nullptr) *where = value;
-}
+using module::store;
 
 // Fills `count` bytes with whole blanks of `width` bytes.
 void fill_blanks(uint8_t *p, int64_t count, const uint8_t *blank, int64_t width) {

@@ -12,6 +12,7 @@
 #include "cursor/char_model.hpp"
 #include "cursor/count_scalar.hpp"
 #include "cursor/count_vector.hpp"
+#include "module/out_value.hpp"
 
 namespace nlssm::cursor {
 
@@ -170,9 +171,7 @@ int64_t num_chars_s(const uint8_t *p, int64_t n, int64_t *count, Fn fn) {
   return c.status;
 }
 
-void store(int64_t *where, int64_t value) {
-  if (where != nullptr) *where = value;
-}
+using module::store;
 
 int64_t strlen8(const uint8_t *p) {
   return static_cast<int64_t>(std::strlen(reinterpret_cast<const char *>(p)));

@@ -10,6 +10,7 @@
 #include <cstring>
 
 #include "cursor/char_model.hpp"
+#include "module/out_value.hpp"
 
 namespace nlssm::edit {
 
@@ -96,8 +97,6 @@ inline void fill_blanks(const NLSSMHandle *h, uint8_t *p, int64_t bytes) {
   std::memcpy(p + off, h->blankChar, static_cast<size_t>(bytes - off));
 }
 
-inline void store(int64_t *where, int64_t value) {
-  if (where != nullptr) *where = value;
-}
+using module::store;
 
 }  // namespace nlssm::edit

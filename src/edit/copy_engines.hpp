@@ -12,6 +12,7 @@
 
 #include "cursor/char_model.hpp"
 #include "module/literal.hpp"
+#include "module/out_value.hpp"
 #include "module/work_buffer.hpp"
 
 namespace nlssm::edit {
@@ -342,9 +343,7 @@ inline bool overlaps(const uint8_t *a, uint64_t an, const uint8_t *b, uint64_t b
   return x < y + bn && y < x + an;
 }
 
-inline void store(int64_t *where, int64_t value) {
-  if (where != nullptr) *where = value;
-}
+using module::store;
 
 using SetPosFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t);
 

@@ -13,6 +13,7 @@
 #include <cstring>
 
 #include "cursor/char_model.hpp"
+#include "module/out_value.hpp"
 
 namespace nlssm::edit {
 
@@ -21,9 +22,7 @@ inline constexpr int64_t kTooSmall = NLSSM_E_DEST_TOO_SMALL;
 inline constexpr int64_t kNullArgument = NLSSM_E_NULL_ARGUMENT;
 inline constexpr int64_t kNoMemory = NLSSM_E_NO_MEMORY;
 
-inline void store(int64_t *where, int64_t value) {
-  if (where != nullptr) *where = value;
-}
+using module::store;
 
 // Copies through the kernel's overlap-safe primitive: block copy for long
 // disjoint ranges, pairs of bytes for short ones.
