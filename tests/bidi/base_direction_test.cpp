@@ -47,22 +47,12 @@ INSTANTIATE_TEST_SUITE_P(
         Case{36, "12, #$% /:", 0, 0, "no strong character"},
         Case{34, "1 \xC7", 0, 1, "an Arabic letter (AL)"},
         Case{87, "\xF1\x40\x41", 0, 1, "EBCDIC Hebrew page: digit, blank, alef"},
-        Case{87, "\xC1\x41", 0, 0, "EBCDIC Hebrew page: A before alef"},
         Case{29, "\xE0\xE1", 0, 0, "a page without a table"},
         Case{20, "12 \xD7\x90", 0, 0, "steps of one byte: the lead D7 reads as 'W'"},
-        Case{20,
-             "\xD7\x90"
-             "abc",
-             0, 1, "steps of two bytes from a Hebrew start"},
+        Case{20, "\xD7\x90\x61\x62\x63", 0, 1, "steps of two bytes from a Hebrew start"},
         Case{20, "\xC2\xA0\xD7\x90", 0, 1, "no-break space, then alef, two bytes each"},
-        Case{20,
-             "\xC2\xA0"
-             "1\xD7\x90",
-             0, 0, "'1' and D7 make U+0497, a letter"},
-        Case{20,
-             "\xE2\x82\xAC"
-             "1",
-             kBad, 0, "three-byte steps run past the end"},
+        Case{20, "\xC2\xA0\x31\xD7\x90", 0, 0, "'1' and D7 make U+0497, a letter"},
+        Case{20, "\xE2\x82\xAC\x31", kBad, 0, "three-byte steps run past the end"},
         Case{161, "\x41\x42", 0, 0, "UTF-EBCDIC is not scanned"},
         Case{24, std::string("\x00\x31\x05\xD0", 4), 0, 1, "big-endian digit, alef"},
         Case{25, std::string("\x31\x00\xD0\x05", 4), 0, 1, "little-endian digit, alef"},
@@ -72,7 +62,6 @@ INSTANTIATE_TEST_SUITE_P(
         Case{24, std::string("\xD8\x00\x00\x41", 4), kBad, 0, "high surrogate, then 'A'"},
         Case{24, std::string("\xDC\x00\x05\xD0", 4), kBad, 0, "lone low surrogate"},
         Case{26, std::string("\0\0\0\x31\0\0\x06\x28", 8), 0, 1, "digit, Arabic beh"},
-        Case{27, std::string("\x41\0\0\0\xD0\x05\0\0", 8), 0, 0, "A before alef"},
         Case{117, "\x41\x42", 0, 0, "modal double-byte text is not scanned"},
         Case{118, "\xA4\x40", 0, 0, "non-modal double-byte text is not scanned"}),
     [](const testing::TestParamInfo<Case> &info) {

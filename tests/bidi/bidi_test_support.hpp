@@ -18,7 +18,6 @@ namespace bidi_test {
 using Bytes = std::vector<uint8_t>;
 
 using test_support::handle;
-using test_support::host;
 
 using Reorder = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, uint8_t *, int64_t,
                             int64_t *, uint8_t *);

@@ -18,22 +18,6 @@ const SbcsSet &set_named(const std::string &name) {
   throw std::runtime_error("no set " + name);
 }
 
-TEST(SbcsTables, Latin1CaseMaps) {
-  for (int b = 0; b < 256; ++b) {
-    const bool upperLetter = (b >= 'A' && b <= 'Z') || (b >= 0xC0 && b <= 0xDE && b != 0xD7);
-    const bool lowerLetter = (b >= 'a' && b <= 'z') || (b >= 0xE0 && b <= 0xFE && b != 0xF7);
-    EXPECT_EQ(lat1_lcs[b], upperLetter ? b + 0x20 : b) << b;
-    EXPECT_EQ(lat1_ucs[b], lowerLetter ? b - 0x20 : b) << b;
-  }
-  // The Windows page has the capital y diaeresis that Latin-1 lacks.
-  EXPECT_EQ(lat1_ucs[0xFF], 0xFF);
-  EXPECT_EQ(wlt1_ucs[0xFF], 0x9F);
-  EXPECT_EQ(wlt1_lcs[0x9F], 0xFF);
-  // Turkish dotted capital I lower-cases to the plain i.
-  EXPECT_EQ(lat5_lcs[0xDD], 'i');
-  EXPECT_EQ(lat5_ucs[0xFD], 'I');
-}
-
 TEST(SbcsTables, ClassExamples) {
   struct Case {
     const uint8_t *table;

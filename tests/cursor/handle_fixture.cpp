@@ -10,11 +10,6 @@ NLSSlot slot(Fn *fn) {
   return reinterpret_cast<NLSSlot>(fn);
 }
 
-template <typename Fn>
-Fn *as(NLSSlot s) {
-  return reinterpret_cast<Fn *>(s);
-}
-
 void set_blank(NLSSMHandle &h, uint8_t b, uint64_t width, bool big) {
   std::memset(h.blankChar, 0, sizeof h.blankChar);
   h.blankChar[big ? width - 1 : 0] = b;
@@ -25,14 +20,7 @@ void mark(NLSSMHandle &h, int low, int high, uint8_t bits) {
   for (int b = low; b <= high; ++b) h.charClass[b] |= bits;
 }
 
-}  // namespace
-
-std::string enc_name(Enc e) {
-  static const char *const kNames[] = {"SBCS",   "UTF8",  "UTFE", "WCS2LE", "WCS2BE", "WCS4LE",
-                                       "WCS4BE", "Modal", "DBCS", "EUCJP",  "EUCTW",  "GB18030"};
-  return kNames[static_cast<int>(e)];
-}
-
+// Shift-JIS lead and trail flags.
 std::vector<uint8_t> shift_jis_flags() {
   std::vector<uint8_t> flags(256, 0);
   for (int b = 0x81; b <= 0x9F; ++b) flags[b] |= 0x44;
@@ -40,6 +28,14 @@ std::vector<uint8_t> shift_jis_flags() {
   for (int b = 0x40; b <= 0x7E; ++b) flags[b] |= 0x08;
   for (int b = 0x80; b <= 0xFC; ++b) flags[b] |= 0x08;
   return flags;
+}
+
+}  // namespace
+
+std::string enc_name(Enc e) {
+  static const char *const kNames[] = {"SBCS",   "UTF8",  "UTFE", "WCS2LE", "WCS2BE", "WCS4LE",
+                                       "WCS4BE", "Modal", "DBCS", "EUCJP",  "EUCTW",  "GB18030"};
+  return kNames[static_cast<int>(e)];
 }
 
 std::unique_ptr<TestHandle> make_handle(Enc e, const uint8_t *flags) {
@@ -177,40 +173,6 @@ std::unique_ptr<TestHandle> make_handle(Enc e, const uint8_t *flags) {
   }
 #undef NLSSM_FILL
   return t;
-}
-
-int64_t set_pos(const NLSSMHandle *h, NLSString *s, int64_t pos, int64_t delta) {
-  return as<decltype(stringSetPos_UTF8)>(h->stringSetPos)(h, s, pos, delta);
-}
-int64_t next_char(const NLSSMHandle *h, NLSString *s) {
-  return as<decltype(stringNextChar_UTF8)>(h->stringNextChar)(h, s);
-}
-int64_t cur_char_size(const NLSSMHandle *h, const NLSString *s) {
-  return as<decltype(stringCurCharSize_UTF8)>(h->stringCurCharSize)(h, s);
-}
-int64_t num_chars_s(const NLSSMHandle *h, const uint8_t *p, int64_t n, int64_t flags,
-                    int64_t *count) {
-  return as<decltype(NLSNumCharsS_UTF8)>(h->NLSNumCharsS)(h, p, n, flags, count);
-}
-int64_t num_chars(const NLSSMHandle *h, const NLSString *s, int64_t flags, int64_t *count) {
-  return as<decltype(NLSNumChars_UTF8)>(h->NLSNumChars)(h, s, flags, count);
-}
-int64_t string_length(const NLSSMHandle *h, const uint8_t *text, int64_t *chars, int64_t *bytes,
-                      int64_t flags) {
-  return as<decltype(NLSStringLength_UTF8)>(h->NLSStringLength)(h, text, chars, bytes, flags);
-}
-int64_t string_nlength(const NLSSMHandle *h, const uint8_t *text, int64_t limit, int64_t *chars,
-                       int64_t *bytes) {
-  return as<decltype(NLSStringNLength_UTF8)>(h->NLSStringNLength)(h, text, limit, chars, bytes);
-}
-int64_t string_blength(const NLSSMHandle *h, const uint8_t *text, int64_t count) {
-  return as<decltype(NLSStringBLength_UTF8)>(h->NLSStringBLength)(h, text, count);
-}
-int64_t byte_length(const NLSSMHandle *h, const NLSString *s, int64_t limit) {
-  return as<decltype(NLSStringByteLength_UTF8)>(h->NLSStringByteLength)(h, s, limit);
-}
-int64_t byte_length_c(const NLSSMHandle *h, const uint8_t *p, int64_t n, int64_t flags) {
-  return as<decltype(NLSStringByteLengthC_UTF8)>(h->NLSStringByteLengthC)(h, p, n, flags);
 }
 
 NLSString descriptor(std::vector<uint8_t> &bytes) {

@@ -5,6 +5,7 @@
 #include <unicode/uset.h>
 
 #include <algorithm>
+#include <memory>
 #include <random>
 #include <string>
 #include <vector>
@@ -17,18 +18,6 @@ namespace {
 struct Page {
   const char *icu;
   Enc enc;
-};
-
-struct Converter {
-  UConverter *cnv = nullptr;
-  explicit Converter(const char *name) {
-    UErrorCode e = U_ZERO_ERROR;
-    cnv = ucnv_open(name, &e);
-    if (U_FAILURE(e)) cnv = nullptr;
-  }
-  ~Converter() {
-    if (cnv != nullptr) ucnv_close(cnv);
-  }
 };
 
 // Code points the converter maps both ways, split into ASCII and the rest
@@ -133,18 +122,20 @@ class IcuDifferential : public ::testing::TestWithParam<Page> {};
 
 TEST_P(IcuDifferential, CursorAndCountsFollowIcuBoundaries) {
   const Page page = GetParam();
-  Converter conv(page.icu);
-  ASSERT_NE(conv.cnv, nullptr) << page.icu;
+  UErrorCode error = U_ZERO_ERROR;
+  const std::unique_ptr<UConverter, decltype(&ucnv_close)> conv(ucnv_open(page.icu, &error),
+                                                                &ucnv_close);
+  ASSERT_TRUE(U_SUCCESS(error)) << page.icu << " " << u_errorName(error);
   std::vector<uint8_t> flags;
-  if (page.enc == Enc::kDbcs) flags = probe_flags(conv.cnv);
+  if (page.enc == Enc::kDbcs) flags = probe_flags(conv.get());
   auto th = make_handle(page.enc, flags.empty() ? nullptr : flags.data());
   const NLSSMHandle *h = &th->h;
-  const Repertoire rep = repertoire(conv.cnv);
+  const Repertoire rep = repertoire(conv.get());
   std::mt19937 rng(20240611u ^ static_cast<unsigned>(page.enc));
 
   for (int round = 0; round < 120; ++round) {
     const int wanted = round < 5 ? round : std::uniform_int_distribution<int>(5, 160)(rng);
-    Sample sample = make_sample(conv.cnv, rep, rng, wanted);
+    Sample sample = make_sample(conv.get(), rep, rng, wanted);
     const auto count = static_cast<int64_t>(sample.starts.size());
     const auto length = static_cast<int64_t>(sample.bytes.size());
     SCOPED_TRACE(::testing::Message() << page.icu << " round " << round << " chars " << count);

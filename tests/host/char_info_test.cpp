@@ -1,9 +1,8 @@
 // Character information over every code point, checked against ICU's property
-// names, and the class masks the classification operations translate to.
+// names, and case folding through the service object.
 #include <gtest/gtest.h>
 #include <unicode/uchar.h>
 
-#include <cctype>
 #include <cstring>
 
 #include "host_test_support.hpp"
@@ -61,31 +60,6 @@ TEST(CharInfo, AgreesWithIcuForEveryCodePoint) {
   EXPECT_EQ(mismatches, 0u);
   NLSHostCharInfo info{};
   EXPECT_EQ(query(nls, 0x110000, info), NLSHOST_E_NOT_A_CHARACTER);
-}
-
-TEST(CharInfo, ClassMasksMeanWhatTheySay) {
-  auto host = standalone();
-  // Class bit -> property word mask, as the classification members translate.
-  const std::uint32_t upper = 0x1, lower = 0x2, digit = 0x40, blank = 0x200, control = 0x3C00;
-  const std::uint32_t notGraph = 0x17E00;
-  for (std::uint32_t c = 0; c < 0x80; ++c) {
-    NLSHostCharInfo info{};
-    ASSERT_EQ(query(host->nls(), c, info), 0);
-    const auto p = info.properties;
-    EXPECT_EQ((p & upper) != 0, std::isupper(static_cast<int>(c)) != 0) << c;
-    EXPECT_EQ((p & lower) != 0, std::islower(static_cast<int>(c)) != 0) << c;
-    EXPECT_EQ((p & digit) != 0, std::isdigit(static_cast<int>(c)) != 0) << c;
-    EXPECT_EQ((p & blank) != 0, c == ' ') << c;
-    EXPECT_EQ((p & control) != 0, std::iscntrl(static_cast<int>(c)) != 0) << c;
-    EXPECT_EQ((p & notGraph) == 0, std::isgraph(static_cast<int>(c)) != 0) << c;
-  }
-  NLSHostCharInfo info{};
-  ASSERT_EQ(query(host->nls(), 0x01C5, info), 0);  // Dz with caron: title case, a letter
-  EXPECT_NE(info.properties & 0x60004, 0u);
-  ASSERT_EQ(query(host->nls(), 0x05D0, info), 0);  // Hebrew alef
-  EXPECT_EQ(info.bidiCategory, NLSHOST_BIDI_R);
-  ASSERT_EQ(query(host->nls(), 0x0627, info), 0);  // Arabic alef
-  EXPECT_EQ(info.bidiCategory, NLSHOST_BIDI_AL);
 }
 
 TEST(CharInfo, FoldingThroughTheServiceObject) {

@@ -69,6 +69,11 @@ struct Converter {
   }
 };
 
+Converter one_way(void *nls, int slot, std::int64_t number) {
+  return {call<NLSHostConverterForFn>(nls, slot, number, static_cast<void *>(nullptr),
+                                      static_cast<void *>(nullptr))};
+}
+
 Converter between(void *nls, std::int64_t from, std::int64_t to) {
   return {call<NLSHostConverterBetweenFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_BETWEEN, from, to,
                                           static_cast<void *>(nullptr),
@@ -92,12 +97,8 @@ TEST(Converters, CompiledPagesAgreeWithTheirMappingsByteForByte) {
     UConverter *icu = open_icu(row.converter, error);
     ASSERT_TRUE(U_SUCCESS(error));
     const bool swapped = row.converter.find(",swaplfnl") != std::string::npos;
-    Converter from{
-        call<NLSHostConverterForFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_FROM, std::int64_t{row.number},
-                                    static_cast<void *>(nullptr), static_cast<void *>(nullptr))};
-    Converter to{call<NLSHostConverterForFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_TO,
-                                             std::int64_t{row.number}, static_cast<void *>(nullptr),
-                                             static_cast<void *>(nullptr))};
+    Converter from = one_way(nls, NLSHOST_SLOT_NLS_CONVERTER_FROM, row.number);
+    Converter to = one_way(nls, NLSHOST_SLOT_NLS_CONVERTER_TO, row.number);
     for (int b = 0; b < 256; ++b) {
       const char byte = static_cast<char>(b);
       UChar units[4];
@@ -127,12 +128,8 @@ TEST(Converters, EveryDescribedEncodingRoundTripsItsRepertoire) {
     SCOPED_TRACE(row.number);
     const std::u32string sample = repertoire_sample(row.converter.c_str(), 1500);
     ASSERT_GT(sample.size(), 100u);
-    Converter to{call<NLSHostConverterForFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_TO,
-                                             std::int64_t{row.number}, static_cast<void *>(nullptr),
-                                             static_cast<void *>(nullptr))};
-    Converter from{
-        call<NLSHostConverterForFn>(nls, NLSHOST_SLOT_NLS_CONVERTER_FROM, std::int64_t{row.number},
-                                    static_cast<void *>(nullptr), static_cast<void *>(nullptr))};
+    Converter to = one_way(nls, NLSHOST_SLOT_NLS_CONVERTER_TO, row.number);
+    Converter from = one_way(nls, NLSHOST_SLOT_NLS_CONVERTER_FROM, row.number);
     ASSERT_NE(to.object, nullptr);
     ASSERT_NE(from.object, nullptr);
     std::string encoded, decoded;
@@ -169,26 +166,28 @@ TEST(Converters, EveryDescribedEncodingRoundTripsItsRepertoire) {
 TEST(Converters, BetweenTwoEncodingsAndStatuses) {
   auto host = standalone();
   void *nls = host->nls();
-  std::string out;
-  // Windows-1252 to EBCDIC 037.
-  EXPECT_EQ(between(nls, 62, 78).convert("Az\xE9", out), 0);
-  EXPECT_EQ(out, "\xC1\xA9\x51");
-  // Into a modal set: shift-out before the double-byte character, shift-in after.
-  EXPECT_EQ(between(nls, 20, 117).convert("A\xE4\xB8\x80", out), 0);
-  ASSERT_EQ(out.size(), 5u);
-  EXPECT_EQ(out.substr(0, 2), "\xC1\x0E");
-  EXPECT_EQ(out.back(), '\x0F');
-  // A character the destination lacks becomes its substitution character.
-  EXPECT_EQ(between(nls, 20, 62).convert("\xE4\xB8\x80", out), 0);
-  EXPECT_EQ(out, "\x1A");
-  // A short destination gets whole characters only.
-  EXPECT_EQ(between(nls, 62, 20).convert("a\xE9", out, 2), NLSHOST_E_TOO_SMALL);
-  EXPECT_EQ(out, "a");
-  EXPECT_EQ(between(nls, 20, 62).convert("a\xFF", out), NLSHOST_E_ILL_FORMED);
-  EXPECT_EQ(out, "a");
-  EXPECT_EQ(between(nls, 20, 62).convert("a\xC3", out), NLSHOST_E_TRUNCATED);
-  EXPECT_EQ(between(nls, 161, 20).convert("\xC1\x80\x41", out), 0);
-  EXPECT_EQ(out, "A\xC2\xA0");
+  const struct {
+    std::int64_t from, to;
+    std::string in;
+    std::size_t capacity;
+    std::int64_t status;
+    std::string out;
+  } cases[] = {
+      {62, 78, "Az\xE9", 0, 0, "\xC1\xA9\x51"},  // windows-1252 to EBCDIC 037
+      // Into a modal set: shift-out before the double-byte character, shift-in after.
+      {20, 117, "A\xE4\xB8\x80", 0, 0, "\xC1\x0E\x4C\x41\x0F"},
+      // A character the destination lacks becomes its substitution character.
+      {20, 62, "\xE4\xB8\x80", 0, 0, "\x1A"},
+      {62, 20, "a\xE9", 2, NLSHOST_E_TOO_SMALL, "a"},  // whole characters only
+      {20, 62, "a\xFF", 0, NLSHOST_E_ILL_FORMED, "a"},
+      {20, 62, "a\xC3", 0, NLSHOST_E_TRUNCATED, "a"},
+      {161, 20, "\xC1\x80\x41", 0, 0, "A\xC2\xA0"},
+  };
+  for (const auto &c : cases) {
+    std::string out;
+    EXPECT_EQ(between(nls, c.from, c.to).convert(c.in, out, c.capacity), c.status) << c.from;
+    EXPECT_EQ(out, c.out) << c.from << " to " << c.to;
+  }
   // Unknown numbers get no converter.
   EXPECT_EQ(between(nls, 62, 0).object, nullptr);
   EXPECT_EQ(between(nls, 265, 62).object, nullptr);
@@ -207,20 +206,16 @@ TEST(Converters, ConversionNeededAndSize) {
   EXPECT_TRUE(needed(62, 29));
   EXPECT_TRUE(needed(62, 0));
 
-  std::uint64_t size = 0;
   const char text[] = "a\xE9\x80";  // a, e-acute and the euro sign in windows-1252
-  EXPECT_EQ(call<NLSHostConversionSizeFn>(nls, NLSHOST_SLOT_NLS_CONVERSION_SIZE, std::int64_t{62},
-                                          std::int64_t{20}, static_cast<const void *>(text),
-                                          std::uint64_t{3}, &size),
-            0);
+  auto size_in = [&](std::int64_t to, std::uint64_t &size) {
+    return call<NLSHostConversionSizeFn>(nls, NLSHOST_SLOT_NLS_CONVERSION_SIZE, std::int64_t{62},
+                                         to, static_cast<const void *>(text), std::uint64_t{3},
+                                         &size);
+  };
+  std::uint64_t size = 0;
+  EXPECT_EQ(size_in(20, size), 0);
   EXPECT_EQ(size, 6u);
-  EXPECT_EQ(call<NLSHostConversionSizeFn>(nls, NLSHOST_SLOT_NLS_CONVERSION_SIZE, std::int64_t{62},
-                                          std::int64_t{27}, static_cast<const void *>(text),
-                                          std::uint64_t{3}, &size),
-            0);
+  EXPECT_EQ(size_in(27, size), 0);
   EXPECT_EQ(size, 12u);
-  EXPECT_EQ(call<NLSHostConversionSizeFn>(nls, NLSHOST_SLOT_NLS_CONVERSION_SIZE, std::int64_t{62},
-                                          std::int64_t{0}, static_cast<const void *>(text),
-                                          std::uint64_t{3}, &size),
-            NLSHOST_E_NO_ENCODING);
+  EXPECT_EQ(size_in(0, size), NLSHOST_E_NO_ENCODING);
 }

@@ -121,23 +121,6 @@ TEST(HostStart, StartsTheModuleAndStopsIt) {
   EXPECT_EQ(host->pools().counts().bytes, 96);
 }
 
-TEST(HostStart, ModuleAllocationFailureIsJournalled) {
-  auto host = ReferenceHost::start(nlssm::refhost::linked_module(),
-                                   [](ReferenceHost &h) { h.pools().fail_allocation_after(1); });
-  EXPECT_EQ(host->module(), nullptr);
-  const auto records = host->journal().records();
-  ASSERT_EQ(records.size(), 1u);
-  EXPECT_EQ(records[0].number, NLSHOST_JOURNAL_LEVEL_ERROR);
-  EXPECT_EQ(records[0].status, NLSSM_E_NO_MEMORY);
-  EXPECT_EQ(host->pools().counts().pools, 0);  // the module gave its pool back
-
-  auto refused = ReferenceHost::start(nlssm::refhost::linked_module(), [](ReferenceHost &h) {
-    h.pools().fail_all_pool_creations(true);
-  });
-  EXPECT_EQ(refused->module(), nullptr);
-  EXPECT_TRUE(refused->journal().records().empty());
-}
-
 TEST(Journal, FormatsAndKeepsMessages) {
   auto host = standalone();
   void *journal = host->journal_object();

@@ -1,7 +1,6 @@
 // Describing encodings: every number against the registry file, and the rows
 // whose meaning the module relies on.
 #include <gtest/gtest.h>
-#include <unicode/ucnv.h>
 
 #include <fstream>
 #include <map>
@@ -45,14 +44,6 @@ std::string name_of(const NLSHostEncodingRecord *record) {
   return name;
 }
 
-std::string canonical(const char *converter) {
-  UErrorCode error = U_ZERO_ERROR;
-  UConverter *c = ucnv_open(converter, &error);
-  std::string name = U_SUCCESS(error) ? ucnv_getName(c, &error) : "";
-  if (c != nullptr) ucnv_close(c);
-  return name;
-}
-
 }  // namespace
 
 TEST(Registry, EveryNumberDescribesAsTheRegistryFileSays) {
@@ -91,66 +82,6 @@ TEST(Registry, EveryNumberDescribesAsTheRegistryFileSays) {
   }
   EXPECT_EQ(described, listed);
   EXPECT_GT(described, 160);
-}
-
-struct TellingRow {
-  int number;
-  std::uint32_t encodingClass;
-  bool ascii;
-  std::uint32_t blank;
-  int numberForm;
-  const char *icuName;  // ICU's canonical name of the converter, "" for the built-in one
-};
-
-class TellingRows : public ::testing::TestWithParam<TellingRow> {};
-
-TEST_P(TellingRows, DescribeAsTheModuleExpects) {
-  const TellingRow &row = GetParam();
-  auto host = standalone();
-  std::int64_t status = 0;
-  const NLSHostEncodingRecord *record = describe(host->nls(), row.number, &status);
-  ASSERT_EQ(status, 0);
-  EXPECT_EQ(record->encodingClass, row.encodingClass);
-  EXPECT_EQ((record->encodingFlags & NLSHOST_ENCODING_ASCII) != 0, row.ascii);
-  EXPECT_EQ(record->blankValue, row.blank);
-  EXPECT_EQ(record->numberForm, row.numberForm);
-  if (*row.icuName != '\0') {
-    EXPECT_EQ(canonical(record->converterName), row.icuName);
-  }
-}
-
-INSTANTIATE_TEST_SUITE_P(
-    Host, TellingRows,
-    ::testing::Values(TellingRow{20, 1, true, 0x20, 0, "UTF-8"},
-                      TellingRow{161, 1, false, 0x40, 0, ""},
-                      TellingRow{24, 2, true, 0x2000, 4, "UTF-16BE"},
-                      TellingRow{25, 2, true, 0x20, 4, "UTF-16LE"},
-                      TellingRow{19, 2, true, 0x20, 4, "UTF-16LE"},
-                      TellingRow{26, 3, true, 0x20000000, 4, "UTF-32BE"},
-                      TellingRow{27, 3, true, 0x20, 0, "UTF-32LE"},
-                      TellingRow{62, 0, true, 0x20, 0, "ibm-5348_P100-1997"},
-                      TellingRow{29, 0, true, 0x20, 0, "ISO-8859-1"},
-                      TellingRow{78, 0, false, 0x40, 0, "ibm-37_P100-1995"},
-                      TellingRow{134, 5, true, 0x20, 0, "ibm-33722_P12A_P12A-2009_U2"},
-                      TellingRow{119, 5, true, 0x20, 0, "ibm-964_P110-1999"},
-                      TellingRow{120, 5, true, 0x20, 0, "ibm-964_P110-1999"},
-                      TellingRow{159, 5, true, 0x20, 0, "euc-tw-2014"},
-                      TellingRow{205, 5, true, 0x20, 0, "gb18030"},
-                      TellingRow{117, 4, false, 0x40, 0, "ibm-937_P110-1999"},
-                      TellingRow{135, 5, true, 0x20, 0, "ibm-943_P15A-2003"}),
-    [](const auto &info) { return "Encoding" + std::to_string(info.param.number); });
-
-TEST(Registry, ModalSetsShiftWithSoAndSi) {
-  auto host = standalone();
-  for (int n : {117, 124, 129, 130, 139, 234, 235, 236, 237, 238}) {
-    std::int64_t status = 0;
-    const NLSHostEncodingRecord *record = describe(host->nls(), n, &status);
-    ASSERT_EQ(status, 0) << n;
-    EXPECT_EQ(record->charRanges.shiftLength, 1) << n;
-    EXPECT_EQ(record->charRanges.shiftOut[0], 0x0E) << n;
-    EXPECT_EQ(record->charRanges.shiftIn[0], 0x0F) << n;
-    EXPECT_EQ(record->charRanges.dbcsSpace[0], 0x40) << n;
-  }
 }
 
 TEST(Registry, LookupByNameOrAlias) {

@@ -69,27 +69,28 @@ TEST(UtfTranscoders, KnownUtfEbcdicForms) {
 
 TEST(UtfTranscoders, BadAndShortInput) {
   auto host = standalone();
-  void *nls = host->nls();
-  std::string out;
-  EXPECT_EQ(transcode(nls, NLSHOST_SLOT_NLS_INTERMEDIATE_TO_UTF8, utf16(u"a\xD800"), out),
-            NLSHOST_E_TRUNCATED);
-  EXPECT_EQ(out, "a");
-  EXPECT_EQ(transcode(nls, NLSHOST_SLOT_NLS_INTERMEDIATE_TO_UTF8, utf16(u"a\xDC00z"), out),
-            NLSHOST_E_ILL_FORMED);
-  EXPECT_EQ(out, "a");
-  EXPECT_EQ(transcode(nls, NLSHOST_SLOT_NLS_UTF8_TO_INTERMEDIATE, "\xE4\xB8", out),
-            NLSHOST_E_TRUNCATED);
-  EXPECT_EQ(transcode(nls, NLSHOST_SLOT_NLS_UTF8_TO_INTERMEDIATE, "\xC0\x80", out),
-            NLSHOST_E_ILL_FORMED);
-  EXPECT_EQ(transcode(nls, NLSHOST_SLOT_NLS_UTF8_TO_INTERMEDIATE, "\xED\xA0\x80", out),
-            NLSHOST_E_ILL_FORMED);
-  EXPECT_EQ(
-      transcode(nls, NLSHOST_SLOT_NLS_CODE_POINT_TO_INTERMEDIATE, host_chars(U"\x110000"), out),
-      NLSHOST_E_ILL_FORMED);
-  EXPECT_EQ(transcode(nls, NLSHOST_SLOT_NLS_UTFE_TO_INTERMEDIATE, "\x41", out),
-            NLSHOST_E_ILL_FORMED);  // a trailing byte alone
-  // Whole characters only: the supplementary character does not fit in 5 bytes.
-  EXPECT_EQ(transcode(nls, NLSHOST_SLOT_NLS_INTERMEDIATE_TO_UTF8, utf16(u"a\U0001F600"), out, 4),
-            NLSHOST_E_TOO_SMALL);
-  EXPECT_EQ(out, "a");
+  const struct {
+    int slot;
+    std::string in;
+    std::size_t capacity;
+    std::int64_t status;
+    std::string out;
+  } cases[] = {
+      {NLSHOST_SLOT_NLS_INTERMEDIATE_TO_UTF8, utf16(u"a\xD800"), 64, NLSHOST_E_TRUNCATED, "a"},
+      {NLSHOST_SLOT_NLS_INTERMEDIATE_TO_UTF8, utf16(u"a\xDC00z"), 64, NLSHOST_E_ILL_FORMED, "a"},
+      {NLSHOST_SLOT_NLS_UTF8_TO_INTERMEDIATE, "\xE4\xB8", 64, NLSHOST_E_TRUNCATED, ""},
+      {NLSHOST_SLOT_NLS_UTF8_TO_INTERMEDIATE, "\xC0\x80", 64, NLSHOST_E_ILL_FORMED, ""},
+      {NLSHOST_SLOT_NLS_UTF8_TO_INTERMEDIATE, "\xED\xA0\x80", 64, NLSHOST_E_ILL_FORMED, ""},
+      {NLSHOST_SLOT_NLS_CODE_POINT_TO_INTERMEDIATE, host_chars(U"\x110000"), 64,
+       NLSHOST_E_ILL_FORMED, ""},
+      // A trailing byte alone.
+      {NLSHOST_SLOT_NLS_UTFE_TO_INTERMEDIATE, "\x41", 64, NLSHOST_E_ILL_FORMED, ""},
+      // Whole characters only: a and the supplementary character need 5 bytes, not 4.
+      {NLSHOST_SLOT_NLS_INTERMEDIATE_TO_UTF8, utf16(u"a\U0001F600"), 4, NLSHOST_E_TOO_SMALL, "a"},
+  };
+  for (const auto &c : cases) {
+    std::string out;
+    EXPECT_EQ(transcode(host->nls(), c.slot, c.in, out, c.capacity), c.status) << c.slot;
+    EXPECT_EQ(out, c.out) << c.slot;
+  }
 }

@@ -98,8 +98,6 @@ TEST(Messages, ExtensionEntryKeepsTheHostHandle) {
   int host = 0, other = 0;
   int64_t major = 0, minor = 0;
   EXPECT_EQ(qvextver(&host, &major, &minor), 0);
-  EXPECT_EQ(major, 6);
-  EXPECT_EQ(minor, 1);
   EXPECT_EQ(Exported_QVHandle, &host);
   EXPECT_EQ(qvextent(&other), 0);
   EXPECT_EQ(Exported_QVHandle, &other);

@@ -62,25 +62,6 @@ TEST(CommonOperations, CleanForgetsOnlyTheBuffer) {
   EXPECT_EQ(stringDupPos(nullptr, &s, &s), 0);
 }
 
-// A converter that widens a byte to big-endian UTF-16.
-struct FakeConverter {
-  void *slots[8] = {};
-  int calls = 0;
-};
-
-int64_t widen(void *self, const void *source, uint64_t bytes, void *destination, uint64_t size,
-              uint64_t *produced, void *) {
-  auto *converter = static_cast<FakeConverter *>(self);
-  converter->calls++;
-  EXPECT_EQ(bytes, 1u);
-  EXPECT_EQ(size, 4u);
-  auto *out = static_cast<uint8_t *>(destination);
-  out[0] = 0;
-  out[1] = *static_cast<const uint8_t *>(source);
-  *produced = 2;
-  return 0;
-}
-
 class CharInit : public ::testing::TestWithParam<uint32_t> {};
 
 TEST_P(CharInit, BuildsOneCharacterRecord) {
@@ -112,17 +93,6 @@ TEST_P(CharInit, BuildsOneCharacterRecord) {
   EXPECT_EQ(NLSCharInit_SBCS(&plain, &quote, 0, &record), 0);
   EXPECT_EQ(record.string.charKind, 0u);
   EXPECT_EQ(record.string.length, 1u);
-
-  FakeConverter converter;
-  converter.slots[NLSHOST_SLOT_CONVERTER_CONVERT] = reinterpret_cast<void *>(&widen);
-  NLSSMHandle converting = plain;
-  converting.charConverter = &converter;
-  converting.unitWidth = 2;
-  EXPECT_EQ(NLSCharInit(&converting, &quote, 0, &record), 0);
-  EXPECT_EQ(converter.calls, 1);
-  EXPECT_EQ(record.string.length, 2u);
-  EXPECT_EQ(record.bytes[0], 0x00);
-  EXPECT_EQ(record.bytes[1], 0x22);
 }
 
 INSTANTIATE_TEST_SUITE_P(EveryClass, CharInit, ::testing::Range(0u, 6u));

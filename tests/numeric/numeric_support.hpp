@@ -46,15 +46,12 @@ inline uint8_t ebcdic(char c) {
 inline std::string encode(const NLSSMHandle *h, const std::string &ascii) {
   std::string out;
   for (char c : ascii) {
-    const auto u = static_cast<uint8_t>(c);
     if (unit_bytes(h) == 4) {
-      const uint8_t le[4] = {u, 0, 0, 0};
       if (h->encodingNumber == NLSSM_ENC_HOST_CHARS)
-        out.append({char(le[0]), char(le[1]), char(le[2]), char(le[3])});
-      else if (h->encodingClass == NLSSM_CLASS_WCS4)
-        out.append({char(le[3]), char(le[2]), char(le[1]), char(le[0])});
+        out.append({c, 0, 0, 0});
       else
-        out.append({char(le[1]), char(le[0]), char(le[3]), char(le[2])});
+        out.append(h->encodingClass == NLSSM_CLASS_WCS4 ? std::string{0, 0, 0, c}
+                                                        : std::string{0, c, 0, 0});
     } else {
       out.push_back((h->encodingFlags & 1u) ? c : static_cast<char>(ebcdic(c)));
     }

@@ -404,21 +404,6 @@ TEST(CopyEditLiterals, SqueezeLiteralBufferComesFromThePool) {
   host().pools().fail_all_allocations(false);
 }
 
-TEST(CopyEditArguments, MissingTextIsANullArgument) {
-  const NLSSMHandle *h = handle(29);
-  Dest dst(8);
-  NLSString empty{};
-  empty.curOffset = NLSSM_POS_NONE;
-  int64_t w = 0;
-  EXPECT_EQ(NLSStringRemoveDelimiters_SBCS(h, nullptr, &dst.d, &w), NLSSM_E_NULL_ARGUMENT);
-  EXPECT_EQ(NLSStringSqueeze_SBCS(h, &empty, 0, nullptr, &dst.d, &w), NLSSM_E_NULL_ARGUMENT);
-  EXPECT_EQ(
-      NLSStringTranwordS_SBCS(h, nullptr, 3, nullptr, 0, nullptr, 0, dst.bytes.data(), 8, &w, 0),
-      NLSSM_E_NULL_ARGUMENT);
-  EXPECT_EQ(NLSStringSqueeze_SBCS(h, &empty, 0, &empty, &dst.d, &w), 0);  // empty is fine
-  EXPECT_TRUE(dst.guards_intact());
-}
-
 }  // namespace
 
 // UTF text, broken sequences included, through both tranword paths: the
