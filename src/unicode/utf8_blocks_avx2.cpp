@@ -245,7 +245,9 @@ void utf8_blocks_avx2(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, bo
       advance = __builtin_ctzll(rest);
     }
     // Offsets of the characters, chunk by chunk of the start mask.
-    alignas(32) uint8_t offsets[48];
+    // Entries past the last character stay zero: a gather loads all eight
+    // lanes, so each must point inside the block.
+    alignas(32) uint8_t offsets[48] = {};
     int filled = 0;
     for (int chunk = 0; chunk < 4; ++chunk) {
       const uint8_t bits = static_cast<uint8_t>(starts >> (8 * chunk));
