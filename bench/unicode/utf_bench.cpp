@@ -71,9 +71,10 @@ const Corpus &corpus(int kind) {
   return corpora[kind];
 }
 
-void label(benchmark::State &state, const Corpus &c) {
+// The kind of text is argument `arg`; `suffix` follows its name.
+void label(benchmark::State &state, const Corpus &c, int arg = 0, const std::string &suffix = {}) {
   static const char *names[] = {"ascii", "european", "mixed", "cjk", "emoji-mixed"};
-  state.SetLabel(names[state.range(0)]);
+  state.SetLabel(names[state.range(arg)] + suffix);
   state.SetBytesProcessed(state.iterations() * c.utf8.size());
   state.counters["chars/s"] =
       benchmark::Counter(double(state.iterations()) * c.utf32.size(), benchmark::Counter::kIsRate);
@@ -90,6 +91,33 @@ void BM_ConvertToUTF32(benchmark::State &state) {
   }
   if (out != c.utf32) state.SkipWithError("wrong result");
   label(state, c);
+}
+
+// The driver with the block step of one instruction set (SSE2: none).
+struct StepDecoder : nlssm::unicode::PolicyDecoder<nlssm::unicode::Utf8Decoder> {
+  nlssm::unicode::Utf8BlockStep step;
+  nlssm::unicode::Utf8BlockStep block_step() const { return step; }
+};
+
+void BM_ConvertToUTF32_isa(benchmark::State &state) {
+  namespace u = nlssm::unicode;
+  const auto isa = kernel::cpu::kAllIsas[state.range(0)];
+  if (!kernel::cpu::supports(isa)) {
+    state.SkipWithError("not on this processor");
+    return;
+  }
+  const Corpus &c = corpus(state.range(1));
+  std::vector<uint32_t> out(c.utf32.size());
+  const StepDecoder decode{{}, u::utf8_block_step(isa)};
+  for (auto _ : state) {
+    int64_t written = 0;
+    u::convert_to_utf32(reinterpret_cast<const uint8_t *>(c.utf8.data()), int64_t(c.utf8.size()),
+                        reinterpret_cast<uint8_t *>(out.data()), int64_t(out.size() * 4), &written,
+                        decode, u::PolicyEncoder<u::Utf32Encoder<u::Order::little>>{});
+    benchmark::DoNotOptimize(written);
+  }
+  if (out != c.utf32) state.SkipWithError("wrong result");
+  label(state, c, 1, std::string(" ") + kernel::cpu::name(isa));
 }
 
 // The same decoder behind a pointer the driver does not recognise.
@@ -171,6 +199,7 @@ int64_t icu_u8_length(const uint32_t *chars, int64_t count) {
 
 BENCHMARK(BM_ConvertToUTF32)->DenseRange(0, 4);
 BENCHMARK(BM_ConvertToUTF32_generic)->DenseRange(0, 4);
+BENCHMARK(BM_ConvertToUTF32_isa)->ArgsProduct({{0, 1, 3}, {0, 1, 2, 3, 4}});
 BENCHMARK(BM_ICU_ucnv_convertEx)->DenseRange(0, 4);
 BENCHMARK(BM_ICU_u_strFromUTF8_ToUTF32)->DenseRange(0, 4);
 BENCHMARK(BM_Utf8Length<GET_UTF8_LEN_FROM_QVCHAR>)->DenseRange(0, 2);

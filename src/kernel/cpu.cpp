@@ -6,7 +6,12 @@
 namespace kernel::cpu {
 namespace {
 
-enum Feature : uint32_t { kAvx2 = 1u << 0, kAvx512Vbmi = 1u << 1, kFastStrings = 1u << 2 };
+enum Feature : uint32_t {
+  kAvx2 = 1u << 0,
+  kAvx512Vbmi = 1u << 1,
+  kFastStrings = 1u << 2,
+  kAvx512Vbmi2 = 1u << 3,
+};
 
 struct Processor {
   uint32_t features;
@@ -24,6 +29,9 @@ uint32_t detect_features() noexcept {
   if ((features & kAvx2) != 0 && __builtin_cpu_supports("avx512f") &&
       __builtin_cpu_supports("avx512bw") && __builtin_cpu_supports("avx512vbmi"))
     features |= kAvx512Vbmi;
+  if ((features & kAvx512Vbmi) != 0 && __builtin_cpu_supports("avx512vbmi2") &&
+      __builtin_cpu_supports("bmi2"))
+    features |= kAvx512Vbmi2;
   // Leaf 7, EBX bit 9: enhanced rep movsb/stosb.
   unsigned a, b, c, d;
   if (__get_cpuid_count(7, 0, &a, &b, &c, &d) != 0 && (b & (1u << 9)) != 0)
@@ -108,6 +116,8 @@ bool supports(Isa isa) noexcept {
       return (processor().features & kAvx2) != 0;
     case Isa::avx512vbmi:
       return (processor().features & kAvx512Vbmi) != 0;
+    case Isa::avx512vbmi2:
+      return (processor().features & kAvx512Vbmi2) != 0;
   }
   return false;
 }
@@ -120,6 +130,8 @@ const char *name(Isa isa) noexcept {
       return "avx2";
     case Isa::avx512vbmi:
       return "avx512vbmi";
+    case Isa::avx512vbmi2:
+      return "avx512vbmi2";
   }
   return "?";
 }

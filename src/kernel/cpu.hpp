@@ -24,9 +24,11 @@ namespace kernel::cpu {
 
 // Instruction sets a hot path may have a variant for, weakest first.
 // avx512vbmi: AVX-512 F and BW with the byte permutes (VBMI).
-enum class Isa : uint8_t { sse2, avx2, avx512vbmi };
+// avx512vbmi2: the same with byte and word compress (VBMI2), BMI2 and popcnt.
+enum class Isa : uint8_t { sse2, avx2, avx512vbmi, avx512vbmi2 };
 
-inline constexpr std::array<Isa, 3> kAllIsas{Isa::sse2, Isa::avx2, Isa::avx512vbmi};
+inline constexpr std::array<Isa, 4> kAllIsas{Isa::sse2, Isa::avx2, Isa::avx512vbmi,
+                                             Isa::avx512vbmi2};
 
 // True when this processor and operating system run code built for `isa`.
 // Detected once; safe to call from any thread at any time.
@@ -135,4 +137,18 @@ class Dispatch {
 #define NLSSM_TARGET_AVX512VBMI_BEGIN \
   _Pragma("GCC push_options") _Pragma("GCC target(\"avx512f,avx512bw,avx512vbmi\")")
 #define NLSSM_TARGET_AVX512VBMI_END _Pragma("GCC pop_options")
+#endif
+
+// The same for AVX-512 code that also compresses bytes and words.
+#if defined(__clang__)
+#define NLSSM_TARGET_AVX512VBMI2_BEGIN \
+  _Pragma(                             \
+      "clang attribute push(__attribute__((target(\"avx512f,avx512bw,avx512vbmi,avx512vbmi2,\
+bmi,bmi2,popcnt\"))), apply_to = function)")
+#define NLSSM_TARGET_AVX512VBMI2_END _Pragma("clang attribute pop")
+#else
+#define NLSSM_TARGET_AVX512VBMI2_BEGIN \
+  _Pragma("GCC push_options")          \
+      _Pragma("GCC target(\"avx512f,avx512bw,avx512vbmi,avx512vbmi2,bmi,bmi2,popcnt\")")
+#define NLSSM_TARGET_AVX512VBMI2_END _Pragma("GCC pop_options")
 #endif

@@ -16,6 +16,7 @@
 #include <cstring>
 
 #include "unicode/tables.hpp"
+#include "unicode/utf8_blocks.hpp"
 
 namespace nlssm::unicode {
 
@@ -71,7 +72,7 @@ inline void put(T *out, T value) {
 // After an invalid lead, continuation bytes are skipped up to the length the
 // lead announces, without regard to the bytes remaining.
 struct Utf8Decoder {
-  static constexpr bool kBulkToUtf32 = true;  // has utf8_to_utf32_bulk
+  static constexpr bool kBulkToUtf32 = true;  // has a bulk loop to UTF-32
 
   static inline uint32_t decode(const uint8_t *s, int64_t remaining, uint32_t *cp,
                                 int64_t *consumed) {
@@ -264,6 +265,8 @@ inline uint32_t utf8_to_utf16_units(const uint8_t *s, int64_t remaining, uint16_
 template <typename Policy>
 struct PolicyDecoder {
   static constexpr bool kBulkToUtf32 = Policy::kBulkToUtf32;
+  // The block step of the bulk loop (decoders with kBulkToUtf32).
+  Utf8BlockStep block_step() const { return utf8_best_block_step(); }
   uint32_t operator()(const uint8_t *s, int64_t n, uint32_t *cp, int64_t *consumed) const {
     return Policy::decode(s, n, cp, consumed);
   }
@@ -301,16 +304,6 @@ struct PointerEncoder {
   }
 };
 
-// The UTF-8 decoder and a 4-byte encoder in one pass: converts characters
-// from `s` + `consumed` into 32-bit slots at `d` + 4 x `chars` (big- or
-// little-endian) while at least 4 source bytes remain, fewer than `limit`
-// characters are stored and each lead byte is valid; advances `consumed` and
-// `chars`. It gives exactly what Utf8Decoder and Utf32Encoder give one by
-// one there (a fixed-width encoder cannot fail within the limit), and leaves
-// the last bytes and any invalid lead to them.
-void utf8_to_utf32_bulk(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, bool big_endian,
-                        int64_t &consumed, int64_t &chars);
-
 // Decodes `source` character by character and encodes each code point into a
 // 4-byte slot of `destination`: at most capacity / 4 characters. Stops at the
 // first failing decode or encode and returns its status; `written` receives
@@ -330,8 +323,8 @@ uint32_t convert_to_utf32(const uint8_t *source, int64_t source_bytes, uint8_t *
   while (chars < limit && consumed < source_bytes) {
     if constexpr (Decoder::kBulkToUtf32 && Encoder::kFixedWidth4) {
       const int64_t before = chars;
-      utf8_to_utf32_bulk(source, source_bytes, destination, limit, Encoder::kBigEndian, consumed,
-                         chars);
+      utf8_to_utf32_bulk(decode.block_step(), source, source_bytes, destination, limit,
+                         Encoder::kBigEndian, consumed, chars);
       room -= 4 * (chars - before);
       if (chars == limit || consumed == source_bytes) break;
     }

@@ -135,14 +135,13 @@ inline void widen16(__m128i x, uint8_t *d) {
 }
 
 template <Order O>
-void bulk_to_utf32(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, int64_t &consumed,
-                   int64_t &chars) {
+void bulk_to_utf32(Utf8BlockStep step, const uint8_t *s, int64_t n, uint8_t *d, int64_t limit,
+                   int64_t &consumed, int64_t &chars) {
   int64_t i = consumed, k = chars;
-  const bool blocks = avx2_usable();
   while (k < limit && n - i >= 4) {
-    if (blocks && n - i >= 35) {
+    if (step != nullptr && n - i >= 35) {
       const int64_t before = i;
-      utf8_blocks_avx2(s, n, d, limit, kIsBig<O>, i, k);
+      step(s, n, d, limit, kIsBig<O>, i, k);
       if (i != before) continue;
     }
     const uint32_t b = s[i];
@@ -188,12 +187,34 @@ void bulk_to_utf32(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, int64
 
 }  // namespace
 
-void utf8_to_utf32_bulk(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, bool big_endian,
-                        int64_t &consumed, int64_t &chars) {
+Utf8BlockStep utf8_block_step(kernel::cpu::Isa isa) {
+  switch (isa) {
+    case kernel::cpu::Isa::avx512vbmi2:
+      return &utf8_blocks_avx512;
+    case kernel::cpu::Isa::avx512vbmi:
+    case kernel::cpu::Isa::avx2:
+      return &utf8_blocks_avx2;
+    case kernel::cpu::Isa::sse2:
+      break;
+  }
+  return nullptr;
+}
+
+Utf8BlockStep utf8_best_block_step() {
+  static const Utf8BlockStep step = [] {
+    for (auto it = kernel::cpu::kAllIsas.rbegin(); it != kernel::cpu::kAllIsas.rend(); ++it)
+      if (kernel::cpu::supports(*it)) return utf8_block_step(*it);
+    return Utf8BlockStep{nullptr};
+  }();
+  return step;
+}
+
+void utf8_to_utf32_bulk(Utf8BlockStep step, const uint8_t *s, int64_t n, uint8_t *d, int64_t limit,
+                        bool big_endian, int64_t &consumed, int64_t &chars) {
   if (big_endian)
-    bulk_to_utf32<Order::big>(s, n, d, limit, consumed, chars);
+    bulk_to_utf32<Order::big>(step, s, n, d, limit, consumed, chars);
   else
-    bulk_to_utf32<Order::little>(s, n, d, limit, consumed, chars);
+    bulk_to_utf32<Order::little>(step, s, n, d, limit, consumed, chars);
 }
 
 }  // namespace nlssm::unicode

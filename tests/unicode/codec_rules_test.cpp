@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 #include <nlssm/nlssm.h>
 
+#include <algorithm>
 #include <random>
 #include <vector>
 
@@ -196,7 +197,28 @@ TEST(ToUtf32Driver, StopsAtLimitOrFailureAndCountsStoredCharacters) {
 // The block path of the known decoder against the one-character loop, on
 // text that mixes characters of every length with the faults a block must
 // stop before: invalid leads, stray and missing continuation bytes, cuts.
+// The UTF-8 decoder with a chosen block step, so that every step this
+// processor can run is checked, not only the best.
+struct StepDecoder : nlssm::unicode::PolicyDecoder<nlssm::unicode::Utf8Decoder> {
+  nlssm::unicode::Utf8BlockStep step;
+  nlssm::unicode::Utf8BlockStep block_step() const { return step; }
+};
+
+template <nlssm::unicode::Order O>
+int64_t to_utf32_with(nlssm::unicode::Utf8BlockStep step, const uint8_t *s, int64_t n, uint8_t *d,
+                      int64_t capacity, int64_t *written) {
+  namespace u = nlssm::unicode;
+  return u::convert_to_utf32(s, n, d, capacity, written, StepDecoder{{}, step},
+                             u::PolicyEncoder<u::Utf32Encoder<O>>{});
+}
+
 TEST(ToUtf32Driver, BlockPathMatchesTheCharacterLoopOnAnyText) {
+  std::vector<nlssm::unicode::Utf8BlockStep> steps;
+  for (auto isa : kernel::cpu::kAllIsas) {
+    const auto step = nlssm::unicode::utf8_block_step(isa);
+    if (kernel::cpu::supports(isa) && std::find(steps.begin(), steps.end(), step) == steps.end())
+      steps.push_back(step);
+  }
   std::mt19937 rng(20261122);
   const std::string pieces[] = {"a",
                                 "Z",
@@ -215,7 +237,7 @@ TEST(ToUtf32Driver, BlockPathMatchesTheCharacterLoopOnAnyText) {
                                 "\xFF"};
   for (int round = 0; round < 6000; ++round) {
     std::vector<uint8_t> text;
-    const size_t target = rng() % 200;
+    const size_t target = rng() % 400;
     const int faults = rng() % 4;  // 0: well-formed pieces only
     while (text.size() < target) {
       const size_t limit = faults == 0 ? 9 : std::size(pieces);
@@ -224,20 +246,26 @@ TEST(ToUtf32Driver, BlockPathMatchesTheCharacterLoopOnAnyText) {
       const int repeat = rng() % 4 == 0 ? 1 + rng() % 24 : 1;
       for (int r = 0; r < repeat; ++r) text.insert(text.end(), piece.begin(), piece.end());
     }
-    const int64_t capacity = rng() % 3 == 0 ? int64_t(rng() % (4 * text.size() + 8)) : 4 * 256;
+    const int64_t capacity = rng() % 3 == 0 ? int64_t(rng() % (4 * text.size() + 8)) : 4 * 512;
     // The decoder may read up to five bytes past the text's end.
     const int64_t length = static_cast<int64_t>(text.size());
     text.resize(text.size() + 5, 0);
     for (NLSUTFEncoder enc : {COPY_UTF32, COPY_UTF32_SWAP}) {
-      std::vector<uint8_t> fast(4 * 256 + 16, 0xEE), slow(4 * 256 + 16, 0xEE);
-      int64_t fastWritten = -1, slowWritten = -1;
-      const int64_t fastStatus =
-          ConvertToUTF32(text.data(), length, fast.data(), capacity, &fastWritten, UTF8_UTF32, enc);
+      std::vector<uint8_t> slow(4 * 512 + 16, 0xEE);
+      int64_t slowWritten = -1;
       const int64_t slowStatus = ConvertToUTF32(text.data(), length, slow.data(), capacity,
                                                 &slowWritten, utf8_via_pointer, enc);
-      ASSERT_EQ(fastStatus, slowStatus) << round;
-      ASSERT_EQ(fastWritten, slowWritten) << round;
-      ASSERT_EQ(fast, slow) << round;
+      for (auto step : steps) {
+        std::vector<uint8_t> fast(slow.size(), 0xEE);
+        int64_t fastWritten = -1;
+        const auto convert = enc == COPY_UTF32 ? &to_utf32_with<nlssm::unicode::Order::big>
+                                               : &to_utf32_with<nlssm::unicode::Order::little>;
+        const int64_t fastStatus =
+            convert(step, text.data(), length, fast.data(), capacity, &fastWritten);
+        ASSERT_EQ(fastStatus, slowStatus) << round;
+        ASSERT_EQ(fastWritten, slowWritten) << round;
+        ASSERT_EQ(fast, slow) << round;
+      }
     }
   }
 }

@@ -1,0 +1,194 @@
+// UTF-8 to UTF-32, 64 source bytes per step with AVX-512 (VBMI and VBMI2):
+// the bulk loop of the decoding driver on processors that have them.
+//
+// A step finds, from masks of the block's byte classes, the characters whose
+// bytes are exactly what their lead bytes announce, as the AVX2 step does.
+// Their start offsets are packed into one vector (a byte compress); each
+// group of sixteen then fetches the four bytes from its start into a 32-bit
+// lane (a byte permute), most significant first. A lane keeps the payload
+// bits of its lead and continuation bytes, chosen by the lead's top nibble,
+// merges the four 6-bit fields with two multiply-adds, and shifts away the
+// fields past the character's length. The bytes a lane fetches past its
+// character are dropped by that shift, so they may be anything.
+// GCC 12's AVX-512 headers start their unmasked forms from a deliberately
+// undefined vector, which its flow analysis then reports.
+#if defined(__GNUC__) && !defined(__clang__)
+#pragma GCC diagnostic ignored "-Wmaybe-uninitialized"
+#endif
+#include <immintrin.h>
+
+#include <cstdint>
+
+#include "kernel/cpu.hpp"
+#include "unicode/utf8_blocks.hpp"
+
+namespace nlssm::unicode {
+
+NLSSM_TARGET_AVX512VBMI2_BEGIN
+
+namespace {
+
+// By the top nibble of a character's first byte: the payload bits of its
+// four bytes (first byte highest), and how far the merged fields shift down.
+// Continuation nibbles (8 to B) never start a character here.
+inline __m512i payload_masks() {
+  return _mm512_setr_epi32(0x7F3F3F3F, 0x7F3F3F3F, 0x7F3F3F3F, 0x7F3F3F3F, 0x7F3F3F3F, 0x7F3F3F3F,
+                           0x7F3F3F3F, 0x7F3F3F3F, 0, 0, 0, 0, 0x1F3F3F3F, 0x1F3F3F3F, 0x0F3F3F3F,
+                           0x073F3F3F);
+}
+inline __m512i field_shifts() {
+  return _mm512_setr_epi32(18, 18, 18, 18, 18, 18, 18, 18, 0, 0, 0, 0, 12, 12, 6, 0);
+}
+
+// Sixteen characters whose first bytes are at the byte offsets in `starts`
+// (lanes `first` to `first` + 15) of `block`, whose last characters may
+// take their last bytes from the start of `next`.
+inline __m512i decode16(__m512i block, __m512i next, __m512i starts, int first) {
+  // Byte 4j + b of the fetch index is start j + 3 - b, so each lane holds
+  // its character's bytes from the first (high) down.
+  const __m512i spread = _mm512_add_epi8(
+      _mm512_set1_epi8(static_cast<char>(first)),
+      _mm512_set_epi8(15, 15, 15, 15, 14, 14, 14, 14, 13, 13, 13, 13, 12, 12, 12, 12, 11, 11, 11,
+                      11, 10, 10, 10, 10, 9, 9, 9, 9, 8, 8, 8, 8, 7, 7, 7, 7, 6, 6, 6, 6, 5, 5, 5,
+                      5, 4, 4, 4, 4, 3, 3, 3, 3, 2, 2, 2, 2, 1, 1, 1, 1, 0, 0, 0, 0));
+  const __m512i index =
+      _mm512_add_epi8(_mm512_permutexvar_epi8(spread, starts), _mm512_set1_epi32(0x00010203));
+  const __m512i bytes = _mm512_permutex2var_epi8(block, index, next);
+  const __m512i nibble = _mm512_srli_epi32(bytes, 28);
+  const __m512i payload =
+      _mm512_and_si512(bytes, _mm512_permutexvar_epi32(nibble, payload_masks()));
+  // Bytes 3, 2 (the first two) and 1, 0 merge into 12-bit halves, then the
+  // halves into 24 bits: first << 18 | second << 12 | third << 6 | fourth.
+  const __m512i halves = _mm512_maddubs_epi16(payload, _mm512_set1_epi16(0x4001));
+  const __m512i merged = _mm512_madd_epi16(halves, _mm512_set1_epi32(0x10000001));
+  return _mm512_srlv_epi32(merged, _mm512_permutexvar_epi32(nibble, field_shifts()));
+}
+
+inline uint64_t at_least(__m512i x, uint8_t bound) {
+  return _mm512_cmpge_epu8_mask(x, _mm512_set1_epi8(static_cast<char>(bound)));
+}
+
+inline void store16(uint8_t *d, __m512i c, __mmask16 lanes, bool big_endian) {
+  if (big_endian) {
+    c = _mm512_shuffle_epi8(c, _mm512_broadcast_i32x4(_mm_setr_epi8(3, 2, 1, 0, 7, 6, 5, 4, 11, 10,
+                                                                    9, 8, 15, 14, 13, 12)));
+  }
+  _mm512_mask_storeu_epi32(d, lanes, c);
+}
+
+}  // namespace
+
+namespace {
+
+// The byte classes of a block, one bit per byte.
+struct Classes {
+  uint64_t cont;      // continuation bytes
+  uint64_t invalid;   // bytes that can never start a character
+  uint64_t expected;  // bytes the block's leads announce as continuations
+  uint64_t spill;     // the same for the three bytes after the block
+};
+
+inline Classes classify(__m512i x, uint64_t high) {
+  const uint64_t ge_c0 = at_least(x, 0xC0), ge_c2 = at_least(x, 0xC2);
+  const uint64_t ge_e0 = at_least(x, 0xE0), ge_f0 = at_least(x, 0xF0);
+  const uint64_t ge_f5 = at_least(x, 0xF5);
+  const uint64_t multi = ge_c2 & ~ge_f5, long3 = ge_e0 & ~ge_f5, lead4 = ge_f0 & ~ge_f5;
+  return {high & ~ge_c0, (ge_c0 & ~ge_c2) | ge_f5, multi << 1 | long3 << 2 | lead4 << 3,
+          multi >> 63 | long3 >> 62 | lead4 >> 61};
+}
+
+// The characters whose first bytes are marked in `starts`, in order.
+inline void decode_starts(__m512i x, __m512i next, uint64_t starts, int count, uint8_t *d,
+                          bool big_endian) {
+  const __m512i offsets = _mm512_set_epi8(
+      63, 62, 61, 60, 59, 58, 57, 56, 55, 54, 53, 52, 51, 50, 49, 48, 47, 46, 45, 44, 43, 42, 41,
+      40, 39, 38, 37, 36, 35, 34, 33, 32, 31, 30, 29, 28, 27, 26, 25, 24, 23, 22, 21, 20, 19, 18,
+      17, 16, 15, 14, 13, 12, 11, 10, 9, 8, 7, 6, 5, 4, 3, 2, 1, 0);
+  const __m512i packed = _mm512_maskz_compress_epi8(starts, offsets);
+  for (int g = 0; g < count; g += 16) {
+    const int m = count - g;
+    const __mmask16 lanes = m >= 16 ? 0xFFFF : static_cast<__mmask16>((1u << m) - 1);
+    store16(d + 4 * g, decode16(x, next, packed, g), lanes, big_endian);
+  }
+}
+
+// One block decoded up to its first fault, the end of the room, or its
+// last character when that one may be cut: the next block starts there.
+// False when the caller must take the next character alone.
+inline bool careful_step(const uint8_t *s, uint8_t *d, int64_t limit, bool big_endian, int64_t &i,
+                         int64_t &k) {
+  const __m512i x = _mm512_loadu_si512(s + i);
+  const Classes c = classify(x, _mm512_movepi8_mask(x));
+  const uint64_t wrong = (c.expected ^ c.cont) | c.invalid;
+  const int clean = wrong == 0 ? 64 : __builtin_ctzll(wrong);
+  uint64_t starts = ~c.cont & (clean == 64 ? ~uint64_t{0} : (uint64_t{1} << clean) - 1);
+  int advance = 64;
+  if (clean < 64 || c.spill != 0) {
+    if (starts == 0) return false;
+    advance = 63 - __builtin_clzll(starts);
+    starts &= ~(uint64_t{1} << advance);
+    if (starts == 0) return false;
+  }
+  int count = __builtin_popcountll(starts);
+  if (count > limit - k) {
+    count = static_cast<int>(limit - k);
+    const uint64_t kept = _pdep_u64((uint64_t{1} << count) - 1, starts);
+    advance = __builtin_ctzll(starts & ~kept);
+    starts = kept;
+  }
+  decode_starts(x, _mm512_setzero_si512(), starts, count, d + 4 * k, big_endian);
+  i += advance;
+  k += count;
+  return clean == 64;
+}
+
+}  // namespace
+
+void utf8_blocks_avx512(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, bool big_endian,
+                        int64_t &consumed, int64_t &chars) {
+  int64_t i = consumed, k = chars;
+  while (n - i >= 64 && k < limit) {
+    // Blocks follow each other at a fixed stride, so loading the next never
+    // waits for this one's classes. A character may run into the next
+    // block: it is decoded with the block its lead is in, from the first
+    // three bytes of the next, and the next block expects those bytes to be
+    // continuations (`carry`). They are taken as they are even when they are
+    // not, as the one-character decoder takes them; the next block then
+    // goes the careful way.
+    uint64_t carry = 0;
+    while (n - i >= 67 && limit - k >= 64) {
+      const __m512i x = _mm512_loadu_si512(s + i);
+      const uint64_t high = _mm512_movepi8_mask(x);
+      if ((high | carry) == 0) {
+        // ASCII: every byte is a character.
+        for (int q = 0; q < 4; ++q) {
+          const __m512i c = _mm512_cvtepu8_epi32(
+              _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i + 16 * q)));
+          store16(d + 4 * (k + 16 * q), c, 0xFFFF, big_endian);
+        }
+        i += 64;
+        k += 64;
+        continue;
+      }
+      const Classes c = classify(x, high);
+      if (((c.expected | carry) ^ c.cont) != 0 || c.invalid != 0) break;
+      const __m512i next = _mm512_maskz_loadu_epi8(0x7, s + i + 64);
+      const uint64_t starts = ~c.cont;
+      const int count = __builtin_popcountll(starts);
+      decode_starts(x, next, starts, count, d + 4 * k, big_endian);
+      i += 64;
+      k += count;
+      carry = c.spill;
+    }
+    // The continuation bytes carried in belong to a character already taken.
+    i += __builtin_popcountll(carry);
+    if (n - i < 64 || k >= limit) break;
+    if (!careful_step(s, d, limit, big_endian, i, k)) break;
+  }
+  consumed = i;
+  chars = k;
+}
+
+NLSSM_TARGET_AVX512VBMI2_END
+
+}  // namespace nlssm::unicode
