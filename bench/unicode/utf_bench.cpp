@@ -6,6 +6,7 @@
 #include <unicode/ustring.h>
 #include <unicode/utf8.h>
 
+#include <cstring>
 #include <random>
 #include <string>
 #include <vector>
@@ -176,6 +177,90 @@ void BM_ICU_u_strFromUTF8_ToUTF32(benchmark::State &state) {
   label(state, c);
 }
 
+// UTF-32 -> UTF-8 (form 0) or UTF-16 little-endian (form 1).
+std::vector<uint8_t> expected_from_utf32(const Corpus &c, int form) {
+  if (form == 0) return std::vector<uint8_t>(c.utf8.begin(), c.utf8.end());
+  std::vector<UChar> utf16(c.utf32.size() * 2);
+  int32_t units = 0;
+  UErrorCode err = U_ZERO_ERROR;
+  u_strFromUTF32(utf16.data(), utf16.size(), &units,
+                 reinterpret_cast<const UChar32 *>(c.utf32.data()), c.utf32.size(), &err);
+  const auto *bytes = reinterpret_cast<const uint8_t *>(utf16.data());
+  return std::vector<uint8_t>(bytes, bytes + 2 * units);
+}
+
+const char *form_name(int form) {
+  return form == 0 ? " to utf8" : " to utf16";
+}
+
+template <typename Policy>
+struct StepEncoder : nlssm::unicode::PolicyEncoder<Policy> {
+  nlssm::unicode::Utf32BlockStep step;
+  nlssm::unicode::Utf32BlockStep block_step() const { return step; }
+};
+
+template <typename Policy>
+int64_t from_utf32_step(nlssm::unicode::Utf32BlockStep step, const Corpus &c, uint8_t *out,
+                        int64_t capacity) {
+  namespace u = nlssm::unicode;
+  int64_t written = 0;
+  u::convert_from_utf32(reinterpret_cast<const uint8_t *>(c.utf32.data()),
+                        int64_t(c.utf32.size() * 4), out, capacity, &written,
+                        StepEncoder<Policy>{{}, step},
+                        u::PolicyDecoder<u::Utf32Decoder<u::Order::little>>{});
+  return written;
+}
+
+// Arguments: instruction set, form, kind of text.
+void BM_ConvertFromUTF32_isa(benchmark::State &state) {
+  namespace u = nlssm::unicode;
+  const auto isa = kernel::cpu::kAllIsas[state.range(0)];
+  if (!kernel::cpu::supports(isa)) {
+    state.SkipWithError("not on this processor");
+    return;
+  }
+  const int form = static_cast<int>(state.range(1));
+  const Corpus &c = corpus(state.range(2));
+  std::vector<uint8_t> out(c.utf32.size() * 4);
+  const auto step = u::utf32_block_step(isa);
+  int64_t written = 0;
+  for (auto _ : state) {
+    written = form == 0 ? from_utf32_step<u::Utf8Encoder>(step, c, out.data(), out.size())
+                        : from_utf32_step<u::Utf16Encoder<u::Order::little>>(step, c, out.data(),
+                                                                             out.size());
+    benchmark::DoNotOptimize(written);
+  }
+  out.resize(written);
+  if (out != expected_from_utf32(c, form)) state.SkipWithError("wrong result");
+  label(state, c, 2, std::string(form_name(form)) + " " + kernel::cpu::name(isa));
+}
+
+// ICU: u_strFromUTF32, then u_strToUTF8 for UTF-8. Arguments: form, kind.
+void BM_ICU_FromUTF32(benchmark::State &state) {
+  const int form = static_cast<int>(state.range(0));
+  const Corpus &c = corpus(state.range(1));
+  std::vector<UChar> utf16(c.utf32.size() * 2);
+  std::vector<uint8_t> out(c.utf32.size() * 4);
+  UErrorCode err = U_ZERO_ERROR;
+  int32_t written = 0;
+  for (auto _ : state) {
+    int32_t units = 0;
+    u_strFromUTF32(utf16.data(), utf16.size(), &units,
+                   reinterpret_cast<const UChar32 *>(c.utf32.data()), c.utf32.size(), &err);
+    if (form == 0)
+      u_strToUTF8(reinterpret_cast<char *>(out.data()), out.size(), &written, utf16.data(), units,
+                  &err);
+    else
+      written = 2 * units;
+    benchmark::DoNotOptimize(written);
+  }
+  if (form == 1) std::memcpy(out.data(), utf16.data(), written);
+  out.resize(written);
+  if (U_FAILURE(err) || out != expected_from_utf32(c, form))
+    state.SkipWithError("ICU conversion failed");
+  label(state, c, 1, form_name(form));
+}
+
 template <int64_t (*Fn)(const uint32_t *, int64_t)>
 void BM_Utf8Length(benchmark::State &state) {
   const Corpus &c = corpus(state.range(0));
@@ -202,6 +287,8 @@ BENCHMARK(BM_ConvertToUTF32_generic)->DenseRange(0, 4);
 BENCHMARK(BM_ConvertToUTF32_isa)->ArgsProduct({{0, 1, 3}, {0, 1, 2, 3, 4}});
 BENCHMARK(BM_ICU_ucnv_convertEx)->DenseRange(0, 4);
 BENCHMARK(BM_ICU_u_strFromUTF8_ToUTF32)->DenseRange(0, 4);
+BENCHMARK(BM_ConvertFromUTF32_isa)->ArgsProduct({{0, 1, 3}, {0, 1}, {0, 1, 2, 3, 4}});
+BENCHMARK(BM_ICU_FromUTF32)->ArgsProduct({{0, 1}, {0, 1, 2, 3, 4}});
 BENCHMARK(BM_Utf8Length<GET_UTF8_LEN_FROM_QVCHAR>)->DenseRange(0, 2);
 BENCHMARK(BM_Utf8Length<nlssm::unicode::utf8_length_scalar>)->DenseRange(0, 2);
 BENCHMARK(BM_Utf8Length<nlssm::unicode::utf8_length_sse2>)->DenseRange(0, 2);

@@ -105,6 +105,10 @@ void fuzz_utf16(const uint8_t *data, int64_t n, NLSUTFDecoder decoder) {
   check(known_status(st) && written >= 0 && written <= capacity && written % 4 == 0);
 }
 
+int64_t utf8_encode_via_pointer(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
+  return UTF32_UTF8(c, d, capacity, written);
+}
+
 // Re-encodes the input read as 32-bit units into an odd-sized destination,
 // with encoders that write short forms without a capacity check.
 void fuzz_from_utf32(const uint8_t *data, int64_t n, int64_t capacity) {
@@ -115,6 +119,18 @@ void fuzz_from_utf32(const uint8_t *data, int64_t n, int64_t capacity) {
     const int64_t st =
         ConvertFromUTF32(src.get(), n, out.get(), capacity, &written, encoder, COPY_UTF32b_SWAP);
     check((st == NLSSM_OK || st == NLSSM_E_DEST_TOO_SMALL) && written >= 0 && written <= capacity);
+  }
+  // UTF-8 on the block path and unit by unit (through a pointer the driver
+  // does not recognise) agree, whether the capacity cuts the text or not.
+  for (int64_t room : {capacity, n}) {
+    std::unique_ptr<uint8_t[]> fast(new uint8_t[room + 1]), slow(new uint8_t[room + 1]);
+    int64_t wf = -1, ws = -1;
+    const int64_t sf =
+        ConvertFromUTF32(src.get(), n, fast.get(), room, &wf, UTF32_UTF8, COPY_UTF32b_SWAP);
+    const int64_t ss =
+        ConvertFromUTF32(src.get(), n, slow.get(), room, &ws, utf8_encode_via_pointer,
+                         COPY_UTF32b_SWAP);
+    check(sf == ss && wf == ws && (wf == 0 || std::memcmp(fast.get(), slow.get(), wf) == 0));
   }
 }
 

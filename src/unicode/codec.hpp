@@ -16,6 +16,7 @@
 #include <cstring>
 
 #include "unicode/tables.hpp"
+#include "unicode/utf32_blocks.hpp"
 #include "unicode/utf8_blocks.hpp"
 
 namespace nlssm::unicode {
@@ -139,6 +140,9 @@ struct Utf16Decoder {
 template <Order O>
 struct Utf32Decoder {
   static constexpr bool kBulkToUtf32 = false;
+  // Plain units the encoding driver may hand to a block step.
+  static constexpr bool kPlainUnits = true;
+  static constexpr bool kBigEndian = kIsBig<O>;
 
   static inline uint32_t decode(const uint8_t *s, int64_t, uint32_t *cp, int64_t *consumed) {
     put(cp, load32<O>(s));
@@ -155,6 +159,8 @@ struct Utf8Encoder {
   static constexpr bool kFixedWidth4 = false;
   // Bytes it may write without looking at the capacity.
   static constexpr int64_t kUncheckedBytes = 1;
+  // The form a block step writes for it.
+  static constexpr Utf32BlockForm kBlockForm = Utf32BlockForm::utf8;
 
   static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
     if (c < 0x80) {
@@ -207,6 +213,8 @@ template <Order O>
 struct Utf16Encoder {
   static constexpr bool kFixedWidth4 = false;
   static constexpr int64_t kUncheckedBytes = 2;
+  static constexpr Utf32BlockForm kBlockForm =
+      kIsBig<O> ? Utf32BlockForm::utf16_big : Utf32BlockForm::utf16_little;
 
   static inline uint32_t encode(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) {
     if (c < 0x10000) {
@@ -265,6 +273,18 @@ inline uint32_t utf8_to_utf16_units(const uint8_t *s, int64_t remaining, uint16_
 template <typename Policy>
 struct PolicyDecoder {
   static constexpr bool kBulkToUtf32 = Policy::kBulkToUtf32;
+  static constexpr bool kPlainUnits = [] {
+    if constexpr (requires { Policy::kPlainUnits; })
+      return Policy::kPlainUnits;
+    else
+      return false;
+  }();
+  static constexpr bool kBigEndian = [] {
+    if constexpr (requires { Policy::kPlainUnits; })
+      return Policy::kBigEndian;
+    else
+      return false;
+  }();
   // The block step of the bulk loop (decoders with kBulkToUtf32).
   Utf8BlockStep block_step() const { return utf8_best_block_step(); }
   uint32_t operator()(const uint8_t *s, int64_t n, uint32_t *cp, int64_t *consumed) const {
@@ -280,6 +300,14 @@ struct PolicyEncoder {
     else
       return false;
   }();
+  static constexpr Utf32BlockForm kBlockForm = [] {
+    if constexpr (requires { Policy::kBlockForm; })
+      return Policy::kBlockForm;
+    else
+      return Utf32BlockForm::none;
+  }();
+  // The block step of the encoding driver (encoders with a block form).
+  Utf32BlockStep block_step() const { return utf32_best_block_step(); }
   static constexpr int64_t unchecked_bytes() { return Policy::kUncheckedBytes; }
   uint32_t operator()(uint32_t c, uint8_t *d, int64_t capacity, int64_t *written) const {
     return Policy::encode(c, d, capacity, written);
@@ -287,6 +315,7 @@ struct PolicyEncoder {
 };
 struct PointerDecoder {
   static constexpr bool kBulkToUtf32 = false;
+  static constexpr bool kPlainUnits = false;
   NLSUTFDecoder fn;
   uint32_t operator()(const uint8_t *s, int64_t n, uint32_t *cp, int64_t *consumed) const {
     return static_cast<uint32_t>(fn(s, n, cp, consumed));
@@ -294,6 +323,7 @@ struct PointerDecoder {
 };
 struct PointerEncoder {
   static constexpr bool kFixedWidth4 = false;
+  static constexpr Utf32BlockForm kBlockForm = Utf32BlockForm::none;
   NLSUTFEncoder fn;
   // What the function may write without looking at the capacity: known for
   // the module's own encoders, 0 (it checks) for any other.
@@ -361,9 +391,15 @@ uint32_t convert_from_utf32(const uint8_t *source, int64_t source_bytes, uint8_t
   }
   const int64_t units = source_bytes / 4;
   int64_t total = 0;
-  int64_t room = capacity;
+  int64_t i = 0;
+  if constexpr (Decoder::kPlainUnits && Encoder::kBlockForm != Utf32BlockForm::none) {
+    if (const Utf32BlockStep step = encode.block_step())
+      step(source, units, Decoder::kBigEndian, Encoder::kBlockForm, destination, capacity, i,
+           total);
+  }
+  int64_t room = capacity - total;
   uint32_t status = NLSSM_OK;
-  for (int64_t i = 0; i < units && room > 0; ++i) {
+  for (; i < units && room > 0; ++i) {
     uint32_t c = 0;
     int64_t used = 0;
     decode(source + 4 * i, source_bytes - 4 * i, &c, &used);

@@ -200,6 +200,28 @@ Utf8BlockStep utf8_block_step(kernel::cpu::Isa isa) {
   return nullptr;
 }
 
+Utf32BlockStep utf32_block_step(kernel::cpu::Isa isa) {
+  switch (isa) {
+    case kernel::cpu::Isa::avx512vbmi2:
+      return &utf32_blocks_avx512;
+    case kernel::cpu::Isa::avx512vbmi:
+    case kernel::cpu::Isa::avx2:
+      return &utf32_blocks_avx2;
+    case kernel::cpu::Isa::sse2:
+      break;
+  }
+  return nullptr;
+}
+
+Utf32BlockStep utf32_best_block_step() {
+  static const Utf32BlockStep step = [] {
+    for (auto it = kernel::cpu::kAllIsas.rbegin(); it != kernel::cpu::kAllIsas.rend(); ++it)
+      if (kernel::cpu::supports(*it)) return utf32_block_step(*it);
+    return Utf32BlockStep{nullptr};
+  }();
+  return step;
+}
+
 Utf8BlockStep utf8_best_block_step() {
   static const Utf8BlockStep step = [] {
     for (auto it = kernel::cpu::kAllIsas.rbegin(); it != kernel::cpu::kAllIsas.rend(); ++it)

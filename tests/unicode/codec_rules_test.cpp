@@ -341,6 +341,80 @@ TEST(FromUtf32Driver, ModuleEncodersNeverWritePastTheCapacity) {
   }
 }
 
+// The encoding driver with a chosen block step (null: unit by unit).
+template <typename Policy>
+struct StepEncoder : nlssm::unicode::PolicyEncoder<Policy> {
+  nlssm::unicode::Utf32BlockStep step;
+  nlssm::unicode::Utf32BlockStep block_step() const { return step; }
+};
+
+template <typename Policy, nlssm::unicode::Order In>
+int64_t from_utf32_with(nlssm::unicode::Utf32BlockStep step, const std::vector<uint8_t> &units,
+                        std::vector<uint8_t> &out, int64_t capacity, int64_t *written) {
+  namespace u = nlssm::unicode;
+  return u::convert_from_utf32(units.data(), static_cast<int64_t>(units.size()), out.data(),
+                               capacity, written, StepEncoder<Policy>{{}, step},
+                               u::PolicyDecoder<u::Utf32Decoder<In>>{});
+}
+
+// Every block step against the unit-by-unit loop, on runs of one UTF-8
+// length (the shapes the steps special-case) and on mixtures, including
+// surrogates and values past 0x10FFFF, with capacities that cut blocks.
+TEST(FromUtf32Driver, BlockStepsMatchTheUnitLoop) {
+  namespace u = nlssm::unicode;
+  std::vector<u::Utf32BlockStep> steps;
+  for (auto isa : kernel::cpu::kAllIsas) {
+    const auto step = u::utf32_block_step(isa);
+    if (step != nullptr && kernel::cpu::supports(isa) &&
+        std::find(steps.begin(), steps.end(), step) == steps.end())
+      steps.push_back(step);
+  }
+  std::mt19937 rng(20261122);
+  auto unit = [&](int kind) -> uint32_t {
+    switch (kind) {
+      case 0:
+        return rng() % 0x80;
+      case 1:
+        return 0x80 + rng() % 0x780;
+      case 2:
+        return 0x800 + rng() % 0xF800;  // surrogates included
+      case 3:
+        return 0x10000 + rng() % 0x100000;
+      default:
+        return rng() % 2 ? rng() : 0x110000 + rng() % 0x1000;
+    }
+  };
+  using Convert = int64_t (*)(u::Utf32BlockStep, const std::vector<uint8_t> &,
+                              std::vector<uint8_t> &, int64_t, int64_t *);
+  const Convert converts[] = {&from_utf32_with<u::Utf8Encoder, u::Order::little>,
+                              &from_utf32_with<u::Utf8Encoder, u::Order::big>,
+                              &from_utf32_with<u::Utf16Encoder<u::Order::little>, u::Order::little>,
+                              &from_utf32_with<u::Utf16Encoder<u::Order::big>, u::Order::big>};
+  for (int round = 0; round < 3000; ++round) {
+    const size_t count = rng() % 200;
+    const int only = rng() % 6;  // 5: any mixture
+    std::vector<uint8_t> units;
+    for (size_t j = 0; j < count; ++j) {
+      const uint32_t c = unit(only < 5 ? only : rng() % 5);
+      for (int b = 0; b < 4; ++b) units.push_back(static_cast<uint8_t>(c >> (8 * b)));
+    }
+    if (rng() % 4 == 0) units.push_back(0x41);  // a trailing partial unit
+    const int64_t capacity = rng() % 2 ? int64_t(rng() % (4 * count + 8)) : 4 * 200 + 8;
+    for (Convert convert : converts) {
+      std::vector<uint8_t> slow(4 * 200 + 24, 0xEE);
+      int64_t slowWritten = -1;
+      const int64_t slowStatus = convert(nullptr, units, slow, capacity, &slowWritten);
+      for (auto step : steps) {
+        std::vector<uint8_t> fast(slow.size(), 0xEE);
+        int64_t fastWritten = -1;
+        ASSERT_EQ(convert(step, units, fast, capacity, &fastWritten), slowStatus) << round;
+        ASSERT_EQ(fastWritten, slowWritten) << round;
+        ASSERT_EQ(fast, slow) << round;
+      }
+    }
+  }
+}
+
 // Leads beyond F7 lie outside the sweep against ICU: followed by
 // continuation bytes they still read as legal.
 TEST(IsLegalUtf8, AcceptsALeadBeyondF7) {
