@@ -273,18 +273,9 @@ inline uint32_t utf8_to_utf16_units(const uint8_t *s, int64_t remaining, uint16_
 template <typename Policy>
 struct PolicyDecoder {
   static constexpr bool kBulkToUtf32 = Policy::kBulkToUtf32;
-  static constexpr bool kPlainUnits = [] {
-    if constexpr (requires { Policy::kPlainUnits; })
-      return Policy::kPlainUnits;
-    else
-      return false;
-  }();
-  static constexpr bool kBigEndian = [] {
-    if constexpr (requires { Policy::kPlainUnits; })
-      return Policy::kBigEndian;
-    else
-      return false;
-  }();
+  // False where the policy does not say.
+  static constexpr bool kPlainUnits = requires { requires Policy::kPlainUnits; };
+  static constexpr bool kBigEndian = requires { requires Policy::kBigEndian; };
   // The block step of the bulk loop (decoders with kBulkToUtf32).
   Utf8BlockStep block_step() const { return utf8_best_block_step(); }
   uint32_t operator()(const uint8_t *s, int64_t n, uint32_t *cp, int64_t *consumed) const {

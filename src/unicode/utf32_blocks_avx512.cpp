@@ -7,12 +7,6 @@
 // completed. A byte compress then keeps the first one to four bytes of every
 // lane, in order. UTF-16: a lane holds its unit, or the two units of its
 // surrogate pair, and a word compress keeps the units that are used.
-//
-// GCC 12's AVX-512 headers start their unmasked forms from a deliberately
-// undefined vector, which its flow analysis then reports.
-#if defined(__GNUC__) && !defined(__clang__)
-#pragma GCC diagnostic ignored "-Wmaybe-uninitialized"
-#endif
 #include <immintrin.h>
 
 #include <cstdint>

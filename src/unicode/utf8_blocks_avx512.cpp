@@ -10,11 +10,6 @@
 // merges the four 6-bit fields with two multiply-adds, and shifts away the
 // fields past the character's length. The bytes a lane fetches past its
 // character are dropped by that shift, so they may be anything.
-// GCC 12's AVX-512 headers start their unmasked forms from a deliberately
-// undefined vector, which its flow analysis then reports.
-#if defined(__GNUC__) && !defined(__clang__)
-#pragma GCC diagnostic ignored "-Wmaybe-uninitialized"
-#endif
 #include <immintrin.h>
 
 #include <cstdint>

@@ -200,6 +200,18 @@ Utf8BlockStep utf8_block_step(kernel::cpu::Isa isa) {
   return nullptr;
 }
 
+namespace {
+
+// The step of the strongest instruction set this processor runs.
+template <typename Step>
+Step best_step(Step (*step_for)(kernel::cpu::Isa)) {
+  for (auto it = kernel::cpu::kAllIsas.rbegin(); it != kernel::cpu::kAllIsas.rend(); ++it)
+    if (kernel::cpu::supports(*it)) return step_for(*it);
+  return nullptr;
+}
+
+}  // namespace
+
 Utf32BlockStep utf32_block_step(kernel::cpu::Isa isa) {
   switch (isa) {
     case kernel::cpu::Isa::avx512vbmi2:
@@ -214,20 +226,12 @@ Utf32BlockStep utf32_block_step(kernel::cpu::Isa isa) {
 }
 
 Utf32BlockStep utf32_best_block_step() {
-  static const Utf32BlockStep step = [] {
-    for (auto it = kernel::cpu::kAllIsas.rbegin(); it != kernel::cpu::kAllIsas.rend(); ++it)
-      if (kernel::cpu::supports(*it)) return utf32_block_step(*it);
-    return Utf32BlockStep{nullptr};
-  }();
+  static const Utf32BlockStep step = best_step(&utf32_block_step);
   return step;
 }
 
 Utf8BlockStep utf8_best_block_step() {
-  static const Utf8BlockStep step = [] {
-    for (auto it = kernel::cpu::kAllIsas.rbegin(); it != kernel::cpu::kAllIsas.rend(); ++it)
-      if (kernel::cpu::supports(*it)) return utf8_block_step(*it);
-    return Utf8BlockStep{nullptr};
-  }();
+  static const Utf8BlockStep step = best_step(&utf8_block_step);
   return step;
 }
 
