@@ -46,9 +46,12 @@ int64_t utf16_length_of_unit(uint32_t c) {
 // the whole block is known to fit; -1 when it does not.
 template <typename Encoder, Order In>
 int64_t encode_by_unit(const uint8_t *s, uint8_t *d, int64_t room, int64_t (*length)(uint32_t)) {
-  int64_t need = 0;
-  for (int j = 0; j < 16; ++j) need += length(load32<In>(s + 4 * j));
-  if (need > room) return -1;
+  // Sixteen units take at most 64 bytes in either form.
+  if (room < 64) {
+    int64_t need = 0;
+    for (int j = 0; j < 16; ++j) need += length(load32<In>(s + 4 * j));
+    if (need > room) return -1;
+  }
   int64_t t = 0;
   for (int j = 0; j < 16; ++j) {
     int64_t out = 0;
