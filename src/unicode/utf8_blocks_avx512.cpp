@@ -75,21 +75,9 @@ inline void store16(uint8_t *d, __m512i c, __mmask16 lanes, bool big_endian) {
 
 namespace {
 
-// The byte classes of a block, one bit per byte.
-struct Classes {
-  uint64_t cont;      // continuation bytes
-  uint64_t invalid;   // bytes that can never start a character
-  uint64_t expected;  // bytes the block's leads announce as continuations
-  uint64_t spill;     // the same for the three bytes after the block
-};
-
-inline Classes classify(__m512i x, uint64_t high) {
-  const uint64_t ge_c0 = at_least(x, 0xC0), ge_c2 = at_least(x, 0xC2);
-  const uint64_t ge_e0 = at_least(x, 0xE0), ge_f0 = at_least(x, 0xF0);
-  const uint64_t ge_f5 = at_least(x, 0xF5);
-  const uint64_t multi = ge_c2 & ~ge_f5, long3 = ge_e0 & ~ge_f5, lead4 = ge_f0 & ~ge_f5;
-  return {high & ~ge_c0, (ge_c0 & ~ge_c2) | ge_f5, multi << 1 | long3 << 2 | lead4 << 3,
-          multi >> 63 | long3 >> 62 | lead4 >> 61};
+inline BlockClasses classify(__m512i x, uint64_t high) {
+  return classify_block<64>(high, at_least(x, 0xC0), at_least(x, 0xC2), at_least(x, 0xE0),
+                            at_least(x, 0xF0), at_least(x, 0xF5));
 }
 
 // The characters whose first bytes are marked in `starts`, in order.
@@ -105,36 +93,6 @@ inline void decode_starts(__m512i x, __m512i next, uint64_t starts, int count, u
     const __mmask16 lanes = m >= 16 ? 0xFFFF : static_cast<__mmask16>((1u << m) - 1);
     store16(d + 4 * g, decode16(x, next, packed, g), lanes, big_endian);
   }
-}
-
-// One block decoded up to its first fault, the end of the room, or its
-// last character when that one may be cut: the next block starts there.
-// False when the caller must take the next character alone.
-inline bool careful_step(const uint8_t *s, uint8_t *d, int64_t limit, bool big_endian, int64_t &i,
-                         int64_t &k) {
-  const __m512i x = _mm512_loadu_si512(s + i);
-  const Classes c = classify(x, _mm512_movepi8_mask(x));
-  const uint64_t wrong = (c.expected ^ c.cont) | c.invalid;
-  const int clean = wrong == 0 ? 64 : __builtin_ctzll(wrong);
-  uint64_t starts = ~c.cont & (clean == 64 ? ~uint64_t{0} : (uint64_t{1} << clean) - 1);
-  int advance = 64;
-  if (clean < 64 || c.spill != 0) {
-    if (starts == 0) return false;
-    advance = 63 - __builtin_clzll(starts);
-    starts &= ~(uint64_t{1} << advance);
-    if (starts == 0) return false;
-  }
-  int count = __builtin_popcountll(starts);
-  if (count > limit - k) {
-    count = static_cast<int>(limit - k);
-    const uint64_t kept = _pdep_u64((uint64_t{1} << count) - 1, starts);
-    advance = __builtin_ctzll(starts & ~kept);
-    starts = kept;
-  }
-  decode_starts(x, _mm512_setzero_si512(), starts, count, d + 4 * k, big_endian);
-  i += advance;
-  k += count;
-  return clean == 64;
 }
 
 }  // namespace
@@ -165,7 +123,7 @@ void utf8_blocks_avx512(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, 
         k += 64;
         continue;
       }
-      const Classes c = classify(x, high);
+      const BlockClasses c = classify(x, high);
       if (((c.expected | carry) ^ c.cont) != 0 || c.invalid != 0) break;
       const __m512i next = _mm512_maskz_loadu_epi8(0x7, s + i + 64);
       const uint64_t starts = ~c.cont;
@@ -178,7 +136,13 @@ void utf8_blocks_avx512(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, 
     // The continuation bytes carried in belong to a character already taken.
     i += __builtin_popcountll(carry);
     if (n - i < 64 || k >= limit) break;
-    if (!careful_step(s, d, limit, big_endian, i, k)) break;
+    const __m512i x = _mm512_loadu_si512(s + i);
+    const CarefulPlan plan = plan_careful<64>(classify(x, _mm512_movepi8_mask(x)), limit - k);
+    if (plan.count == 0) break;
+    decode_starts(x, _mm512_setzero_si512(), plan.starts, plan.count, d + 4 * k, big_endian);
+    i += plan.advance;
+    k += plan.count;
+    if (!plan.clean) break;  // the caller takes the faulty character alone
   }
   consumed = i;
   chars = k;
