@@ -18,6 +18,7 @@
 #include <immintrin.h>
 
 #include <array>
+#include <bit>
 #include <cstdint>
 
 #include "kernel/cpu.hpp"
@@ -150,60 +151,42 @@ inline BlockClasses classify(__m256i x, uint32_t high) {
                             at_least(x, 0xF0), at_least(x, 0xF5));
 }
 
+// A 32-byte block. A group reads eleven bytes from its first, and a run of
+// three-byte characters sixteen from its ninth, so a block reads sixteen
+// bytes after it.
+struct Avx2Block {
+  static constexpr int kWidth = 32, kCleanBytes = 48, kCarefulBytes = 48;
+  const uint8_t *p;
+  __m256i x;
+  uint32_t high;
+  explicit Avx2Block(const uint8_t *at)
+      : p(at),
+        x(_mm256_loadu_si256(reinterpret_cast<const __m256i *>(at))),
+        high(static_cast<uint32_t>(_mm256_movemask_epi8(x))) {}
+  BlockClasses classes() const { return classify(x, high); }
+  void widen_ascii(uint8_t *d, bool big_endian) const { widen_ascii32(p, d, big_endian); }
+  int decode_clean(uint64_t starts, uint8_t *d, bool big_endian) const {
+    if (starts == (at_least(x, 0xE0) & ~at_least(x, 0xF0))) {
+      // Three-byte characters only (CJK): two fixed shuffles.
+      const int first = std::countr_zero(starts), count = std::popcount(starts);
+      store8(d, decode_three8(p + first), 8, big_endian);
+      store8(d + 32, decode_three8(p + first + 24), count - 8, big_endian);
+      return count;
+    }
+    return decode_starts(p, static_cast<uint32_t>(starts), high, d, big_endian);
+  }
+  void decode(uint64_t starts, int, uint8_t *d, bool big_endian) const {
+    decode_starts(p, static_cast<uint32_t>(starts), high, d, big_endian);
+  }
+};
+
+#include "unicode/utf8_blocks_loop.inc"
+
 }  // namespace
 
 void utf8_blocks_avx2(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, bool big_endian,
                       int64_t &consumed, int64_t &chars) {
-  int64_t i = consumed, k = chars;
-  // A group reads eleven bytes from its first, and a run of three-byte
-  // characters sixteen from its ninth, so a block needs sixteen bytes after
-  // it.
-  while (n - i >= 48 && k < limit) {
-    // A character that runs into the next block is decoded with the block
-    // of its lead, and the next block expects its last bytes (`carry`).
-    // They are taken as they are even when they are not continuations, as
-    // the one-character decoder takes them; the next block then goes the
-    // careful way.
-    uint64_t carry = 0;
-    while (n - i >= 48 && limit - k >= 32) {
-      const __m256i x = _mm256_loadu_si256(reinterpret_cast<const __m256i *>(s + i));
-      const uint32_t high = static_cast<uint32_t>(_mm256_movemask_epi8(x));
-      if ((high | carry) == 0) {
-        widen_ascii32(s + i, d + 4 * k, big_endian);
-        i += 32;
-        k += 32;
-        continue;
-      }
-      const BlockClasses c = classify(x, high);
-      if (((c.expected | carry) ^ c.cont) != 0 || c.invalid != 0) break;
-      const uint32_t starts = static_cast<uint32_t>(~c.cont);
-      const uint32_t threes = at_least(x, 0xE0) & ~at_least(x, 0xF0);
-      if (starts == threes) {
-        // Three-byte characters only (CJK): two fixed shuffles.
-        const int first = __builtin_ctz(starts), count = __builtin_popcount(starts);
-        store8(d + 4 * k, decode_three8(s + i + first), 8, big_endian);
-        store8(d + 4 * (k + 8), decode_three8(s + i + first + 24), count - 8, big_endian);
-        k += count;
-      } else {
-        k += decode_starts(s + i, starts, high, d + 4 * k, big_endian);
-      }
-      i += 32;
-      carry = c.spill;
-    }
-    // The continuation bytes carried in belong to a character already taken.
-    i += __builtin_popcountll(carry);
-    if (n - i < 48 || k >= limit) break;
-    const __m256i x = _mm256_loadu_si256(reinterpret_cast<const __m256i *>(s + i));
-    const uint32_t high = static_cast<uint32_t>(_mm256_movemask_epi8(x));
-    const CarefulPlan plan = plan_careful<32>(classify(x, high), limit - k);
-    if (plan.count == 0) break;
-    decode_starts(s + i, static_cast<uint32_t>(plan.starts), high, d + 4 * k, big_endian);
-    i += plan.advance;
-    k += plan.count;
-    if (!plan.clean) break;  // the caller takes the faulty character alone
-  }
-  consumed = i;
-  chars = k;
+  decode_blocks<Avx2Block>(s, n, d, limit, big_endian, consumed, chars);
 }
 
 NLSSM_TARGET_AVX2_END

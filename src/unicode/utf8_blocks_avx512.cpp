@@ -12,6 +12,7 @@
 // character are dropped by that shift, so they may be anything.
 #include <immintrin.h>
 
+#include <bit>
 #include <cstdint>
 
 #include "kernel/cpu.hpp"
@@ -95,57 +96,40 @@ inline void decode_starts(__m512i x, __m512i next, uint64_t starts, int count, u
   }
 }
 
+// A 64-byte block; a clean one takes the last bytes of its last character
+// from the three bytes after it.
+struct Avx512Block {
+  static constexpr int kWidth = 64, kCleanBytes = 67, kCarefulBytes = 64;
+  const uint8_t *p;
+  __m512i x;
+  uint64_t high;
+  explicit Avx512Block(const uint8_t *at)
+      : p(at), x(_mm512_loadu_si512(at)), high(_mm512_movepi8_mask(x)) {}
+  BlockClasses classes() const { return classify(x, high); }
+  void widen_ascii(uint8_t *d, bool big_endian) const {
+    for (int q = 0; q < 4; ++q) {
+      const __m512i c =
+          _mm512_cvtepu8_epi32(_mm_loadu_si128(reinterpret_cast<const __m128i *>(p + 16 * q)));
+      store16(d + 64 * q, c, 0xFFFF, big_endian);
+    }
+  }
+  int decode_clean(uint64_t starts, uint8_t *d, bool big_endian) const {
+    const int count = std::popcount(starts);
+    decode_starts(x, _mm512_maskz_loadu_epi8(0x7, p + 64), starts, count, d, big_endian);
+    return count;
+  }
+  void decode(uint64_t starts, int count, uint8_t *d, bool big_endian) const {
+    decode_starts(x, _mm512_setzero_si512(), starts, count, d, big_endian);
+  }
+};
+
+#include "unicode/utf8_blocks_loop.inc"
+
 }  // namespace
 
 void utf8_blocks_avx512(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, bool big_endian,
                         int64_t &consumed, int64_t &chars) {
-  int64_t i = consumed, k = chars;
-  while (n - i >= 64 && k < limit) {
-    // Blocks follow each other at a fixed stride, so loading the next never
-    // waits for this one's classes. A character may run into the next
-    // block: it is decoded with the block its lead is in, from the first
-    // three bytes of the next, and the next block expects those bytes to be
-    // continuations (`carry`). They are taken as they are even when they are
-    // not, as the one-character decoder takes them; the next block then
-    // goes the careful way.
-    uint64_t carry = 0;
-    while (n - i >= 67 && limit - k >= 64) {
-      const __m512i x = _mm512_loadu_si512(s + i);
-      const uint64_t high = _mm512_movepi8_mask(x);
-      if ((high | carry) == 0) {
-        // ASCII: every byte is a character.
-        for (int q = 0; q < 4; ++q) {
-          const __m512i c = _mm512_cvtepu8_epi32(
-              _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i + 16 * q)));
-          store16(d + 4 * (k + 16 * q), c, 0xFFFF, big_endian);
-        }
-        i += 64;
-        k += 64;
-        continue;
-      }
-      const BlockClasses c = classify(x, high);
-      if (((c.expected | carry) ^ c.cont) != 0 || c.invalid != 0) break;
-      const __m512i next = _mm512_maskz_loadu_epi8(0x7, s + i + 64);
-      const uint64_t starts = ~c.cont;
-      const int count = __builtin_popcountll(starts);
-      decode_starts(x, next, starts, count, d + 4 * k, big_endian);
-      i += 64;
-      k += count;
-      carry = c.spill;
-    }
-    // The continuation bytes carried in belong to a character already taken.
-    i += __builtin_popcountll(carry);
-    if (n - i < 64 || k >= limit) break;
-    const __m512i x = _mm512_loadu_si512(s + i);
-    const CarefulPlan plan = plan_careful<64>(classify(x, _mm512_movepi8_mask(x)), limit - k);
-    if (plan.count == 0) break;
-    decode_starts(x, _mm512_setzero_si512(), plan.starts, plan.count, d + 4 * k, big_endian);
-    i += plan.advance;
-    k += plan.count;
-    if (!plan.clean) break;  // the caller takes the faulty character alone
-  }
-  consumed = i;
-  chars = k;
+  decode_blocks<Avx512Block>(s, n, d, limit, big_endian, consumed, chars);
 }
 
 NLSSM_TARGET_AVX512VBMI2_END
