@@ -4,9 +4,10 @@
 // by one, each replacement by the find count.
 #include <nlssm/nlssm.h>
 
+#include <algorithm>
 #include <cstdint>
-#include <cstring>
 
+#include "casecmp/search_vector.hpp"
 #include "edit/copy_engines.hpp"
 
 namespace nlssm::edit {
@@ -80,8 +81,8 @@ int64_t tranword_walk(const C &c, const TranwordArgs &a, int64_t findCount, Writ
 
 // Classes in which every byte the find word can start with starts a
 // character (single-byte, and UTF text when the word starts with a lead
-// byte): candidates are found with memchr and memcmp, and the text between
-// matches is copied in blocks. In single-byte text n counts the bytes; UTF
+// byte): the word's bytes are found by the vector search under Index, and
+// the text between matches is copied in blocks. In single-byte text n counts the bytes; UTF
 // text comes here only when n cannot run out.
 template <class C>
 int64_t tranword_scan(const C &c, const TranwordArgs &a, int64_t findCount, Writer<C> &w) {
@@ -111,22 +112,21 @@ int64_t tranword_scan(const C &c, const TranwordArgs &a, int64_t findCount, Writ
   };
   while (left > 0 && start < end) {
     const int64_t stop = C::kBytes && left < end - start ? start + left : end;
-    const auto *hit = fl == 0 || pos >= stop
-                          ? nullptr
-                          : static_cast<const uint8_t *>(
-                                std::memchr(p + pos, *a.find.p, static_cast<size_t>(stop - pos)));
-    if (hit == nullptr) {
+    // The next place the word's bytes stand, starting before stop.
+    const int64_t h = fl == 0 || pos >= stop
+                          ? -1
+                          : casecmp::simd::find_bytes(p, std::min(end, stop + fl - 1), a.find.p,
+                                                      fl, 1, pos);
+    if (h < 0) {
       if (!flush(stop)) return kDestTooSmall;
       break;
     }
-    const int64_t h = hit - p;
     pos = h + 1;
-    if (end - h < fl || std::memcmp(hit, a.find.p, static_cast<size_t>(fl)) != 0) continue;
     // Equal bytes are equal characters, unless the word's last character is
     // cut short where the text's goes on.
-    if (c.at(hit + last.offset, end - h - last.offset, 0).size != last.size) continue;
-    src.off = h;
-    const Reader<C> at = src;
+    if (c.at(p + h + last.offset, end - h - last.offset, 0).size != last.size) continue;
+    Reader<C> at = src;
+    at.off = h;
     src.off = h + fl;
     if (!flush(h)) return kDestTooSmall;
     if (!replace(c, a, findCount, src, at, w, left)) return kDestTooSmall;

@@ -237,6 +237,7 @@ TEST_P(CopyEdits, TranwordReplacesWholeWordsWithoutOverlap) {
   expect(tranword("abcab", "ab", "", 2), 0, "c");
   expect(tranword("abcab", "", "x", 1), 0, "abcab");
   expect(tranword("abcabc", "c", "WW", 1, 4), 0, "abWWa");
+  expect(tranword("xab", "ab", "c", 2, 2), 0, "xc");  // a match that n reaches is replaced whole
 }
 
 TEST_P(CopyEdits, SqueezeReducesRunsOfOneCharacter) {
