@@ -59,12 +59,26 @@ std::string to_utf8(const std::vector<uint32_t> &text) {
   return out;
 }
 
-constexpr size_t kChars = 1 << 16;
+// 64 KiB of UTF-8, cut at a character boundary.
+constexpr size_t kBytes = 64 << 10;
+
+std::vector<uint32_t> make_corpus_text(int kind) {
+  std::vector<uint32_t> text = make_text(kind, kBytes);
+  size_t bytes = 0, chars = 0;
+  while (chars < text.size()) {
+    const size_t next = bytes + U8_LENGTH(text[chars]);
+    if (next > kBytes) break;
+    bytes = next;
+    ++chars;
+  }
+  text.resize(chars);
+  return text;
+}
 
 struct Corpus {
   std::vector<uint32_t> utf32;
   std::string utf8;
-  explicit Corpus(int kind) : utf32(make_text(kind, kChars)), utf8(to_utf8(utf32)) {}
+  explicit Corpus(int kind) : utf32(make_corpus_text(kind)), utf8(to_utf8(utf32)) {}
 };
 
 const Corpus &corpus(int kind) {
