@@ -84,6 +84,7 @@ MapIsa best_map_isa() {
 
 ByteMap::ByteMap(const uint8_t *table, MapIsa isa) : isa_(isa) {
   std::memcpy(table_, table, 256);
+  if (isa_ == MapIsa::kScalar) return;  // the table alone
   if (isa_ == MapIsa::kAvx2 && !kernel::cpu::supports(kernel::cpu::Isa::avx2)) isa_ = MapIsa::kSse2;
   for (int b = 0; b < 256; ++b) {
     if (table[b] == b) continue;

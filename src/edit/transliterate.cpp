@@ -29,6 +29,10 @@ int64_t pair_count(const C &c, const TranslitArgs &a) {
   return a.pairs > 0 && a.pairs < lists ? a.pairs : lists;
 }
 
+// Texts shorter than this (records of a few dozen bytes) map byte by byte:
+// preparing the vector paths would cost more than they save.
+constexpr int64_t kShortText = 256;
+
 Result transliterate_bytes(const TranslitArgs &a, int64_t pairs, uint8_t *out, int64_t room) {
   uint8_t map[256];
   for (int b = 0; b < 256; ++b) map[b] = static_cast<uint8_t>(b);
@@ -36,7 +40,7 @@ Result transliterate_bytes(const TranslitArgs &a, int64_t pairs, uint8_t *out, i
   int64_t count = a.src.length;
   if (a.n > 0 && a.n < count) count = a.n;
   const int64_t done = count < room ? count : room;
-  ByteMap(map, best_map_isa()).apply(a.src.p, out, done);
+  ByteMap(map, done < kShortText ? MapIsa::kScalar : best_map_isa()).apply(a.src.p, out, done);
   return {count > room ? kDestTooSmall : kOk, done};
 }
 
@@ -108,7 +112,8 @@ Result transliterate(const C &c, const TranslitArgs &a, uint8_t *out, int64_t ro
     return transliterate_bytes(a, pairs, out, room);
   } else {
     const Pairs<C> table(c, a, pairs);
-    const ByteMap bytes(table.bytes, Pairs<C>::kByteRuns ? best_map_isa() : MapIsa::kScalar);
+    const bool vector = Pairs<C>::kByteRuns && a.src.length >= kShortText;
+    const ByteMap bytes(table.bytes, vector ? best_map_isa() : MapIsa::kScalar);
     Reader<C> src(c, a.src);
     Writer<C> w(c, out, room, dbl);
     int64_t left = a.n > 0 ? a.n : -1;
