@@ -40,6 +40,24 @@ constexpr std::array<std::array<uint32_t, 8>, 256> make_pack32() {
 }
 alignas(32) constexpr std::array<std::array<uint32_t, 8>, 256> kPack32 = make_pack32();
 
+// For every 8-bit mask of 16-bit lanes, the byte shuffle that packs the
+// marked lanes to the front, in order.
+constexpr std::array<std::array<uint8_t, 16>, 256> make_pack16() {
+  std::array<std::array<uint8_t, 16>, 256> t{};
+  for (int m = 0; m < 256; ++m) {
+    int n = 0;
+    for (int lane = 0; lane < 8; ++lane) {
+      if (m >> lane & 1) {
+        t[m][n++] = static_cast<uint8_t>(2 * lane);
+        t[m][n++] = static_cast<uint8_t>(2 * lane + 1);
+      }
+    }
+    for (int b = n; b < 16; ++b) t[m][b] = 0x80;
+  }
+  return t;
+}
+alignas(16) constexpr std::array<std::array<uint8_t, 16>, 256> kPack16 = make_pack16();
+
 }  // namespace
 
 NLSSM_TARGET_AVX2_BEGIN
@@ -151,6 +169,34 @@ inline BlockClasses classify(__m256i x, uint32_t high) {
                             at_least(x, 0xF0), at_least(x, 0xF5));
 }
 
+// The characters of up to three bytes starting at the marked bytes of 16
+// bytes from `p` (reading two more): the 16-bit value of a character at
+// every byte, then the values at the starts packed, eight bytes at a time.
+inline int decode_short16(const uint8_t *p, uint32_t starts, uint8_t *d, bool big_endian) {
+  auto bytes_from = [&](int at) {
+    return _mm256_cvtepu8_epi16(_mm_loadu_si128(reinterpret_cast<const __m128i *>(p + at)));
+  };
+  const __m256i b0 = bytes_from(0), b1 = bytes_from(1), b2 = bytes_from(2);
+  const __m256i low6 = _mm256_set1_epi16(0x3F);
+  const __m256i second = _mm256_and_si256(b1, low6);
+  const __m256i two =
+      _mm256_or_si256(_mm256_slli_epi16(_mm256_and_si256(b0, _mm256_set1_epi16(0x1F)), 6), second);
+  const __m256i three =
+      _mm256_or_si256(_mm256_slli_epi16(b0, 12),
+                      _mm256_or_si256(_mm256_slli_epi16(second, 6), _mm256_and_si256(b2, low6)));
+  __m256i v = _mm256_blendv_epi8(b0, two, _mm256_cmpgt_epi16(b0, _mm256_set1_epi16(0xBF)));
+  v = _mm256_blendv_epi8(v, three, _mm256_cmpgt_epi16(b0, _mm256_set1_epi16(0xDF)));
+  const unsigned low = starts & 0xFF, high = starts >> 8 & 0xFF;
+  const __m256i packed = _mm256_shuffle_epi8(
+      v, _mm256_loadu2_m128i(reinterpret_cast<const __m128i *>(kPack16[high].data()),
+                             reinterpret_cast<const __m128i *>(kPack16[low].data())));
+  const int first = std::popcount(low), second_count = std::popcount(high);
+  store8(d, _mm256_cvtepu16_epi32(_mm256_castsi256_si128(packed)), first, big_endian);
+  store8(d + 4 * first, _mm256_cvtepu16_epi32(_mm256_extracti128_si256(packed, 1)), second_count,
+         big_endian);
+  return first + second_count;
+}
+
 // A 32-byte block. A group reads eleven bytes from its first, and a run of
 // three-byte characters sixteen from its ninth, so a block reads sixteen
 // bytes after it.
@@ -172,6 +218,12 @@ struct Avx2Block {
       store8(d, decode_three8(p + first), 8, big_endian);
       store8(d + 32, decode_three8(p + first + 24), count - 8, big_endian);
       return count;
+    }
+    if (at_least(x, 0xF0) == 0) {
+      // No four-byte character: 16-bit values, sixteen bytes at a time.
+      const int first = decode_short16(p, static_cast<uint32_t>(starts), d, big_endian);
+      return first +
+             decode_short16(p + 16, static_cast<uint32_t>(starts >> 16), d + 4 * first, big_endian);
     }
     return decode_starts(p, static_cast<uint32_t>(starts), high, d, big_endian);
   }

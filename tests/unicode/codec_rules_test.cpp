@@ -4,6 +4,7 @@
 #include <nlssm/nlssm.h>
 
 #include <algorithm>
+#include <array>
 #include <random>
 #include <vector>
 
@@ -239,8 +240,11 @@ TEST(ToUtf32Driver, BlockPathMatchesTheCharacterLoopOnAnyText) {
     std::vector<uint8_t> text;
     const size_t target = rng() % 400;
     const int faults = rng() % 4;  // 0: well-formed pieces only
+    // Well-formed texts of up to two, up to three or up to four bytes a
+    // character: the blocks take a different way for each.
+    const size_t well_formed = std::array<size_t, 3>{5, 7, 9}[rng() % 3];
     while (text.size() < target) {
-      const size_t limit = faults == 0 ? 9 : std::size(pieces);
+      const size_t limit = faults == 0 ? well_formed : std::size(pieces);
       const auto &piece = pieces[rng() % limit];
       // Runs of one piece give the blocks of a single shape.
       const int repeat = rng() % 4 == 0 ? 1 + rng() % 24 : 1;
