@@ -187,52 +187,50 @@ void bulk_to_utf32(Utf8BlockStep step, const uint8_t *s, int64_t n, uint8_t *d, 
 
 }  // namespace
 
-Utf8BlockStep utf8_block_step(kernel::cpu::Isa isa) {
+namespace {
+
+// The block steps built for one instruction set.
+struct BlockSteps {
+  Utf8BlockStep utf8 = nullptr;
+  Utf32BlockStep utf32 = nullptr;
+};
+
+BlockSteps block_steps(kernel::cpu::Isa isa) {
   switch (isa) {
     case kernel::cpu::Isa::avx512vbmi2:
-      return &utf8_blocks_avx512;
+      return {&utf8_blocks_avx512, &utf32_blocks_avx512};
     case kernel::cpu::Isa::avx512vbmi:
     case kernel::cpu::Isa::avx2:
-      return &utf8_blocks_avx2;
+      return {&utf8_blocks_avx2, &utf32_blocks_avx2};
     case kernel::cpu::Isa::sse2:
       break;
   }
-  return nullptr;
+  return {};
 }
 
-namespace {
-
-// The step of the strongest instruction set this processor runs.
-template <typename Step>
-Step best_step(Step (*step_for)(kernel::cpu::Isa)) {
-  for (auto it = kernel::cpu::kAllIsas.rbegin(); it != kernel::cpu::kAllIsas.rend(); ++it)
-    if (kernel::cpu::supports(*it)) return step_for(*it);
-  return nullptr;
+// The steps of the strongest instruction set this processor runs.
+const BlockSteps &best_block_steps() {
+  static const BlockSteps steps = [] {
+    for (auto it = kernel::cpu::kAllIsas.rbegin(); it != kernel::cpu::kAllIsas.rend(); ++it)
+      if (kernel::cpu::supports(*it)) return block_steps(*it);
+    return BlockSteps{};
+  }();
+  return steps;
 }
 
 }  // namespace
 
+Utf8BlockStep utf8_block_step(kernel::cpu::Isa isa) {
+  return block_steps(isa).utf8;
+}
 Utf32BlockStep utf32_block_step(kernel::cpu::Isa isa) {
-  switch (isa) {
-    case kernel::cpu::Isa::avx512vbmi2:
-      return &utf32_blocks_avx512;
-    case kernel::cpu::Isa::avx512vbmi:
-    case kernel::cpu::Isa::avx2:
-      return &utf32_blocks_avx2;
-    case kernel::cpu::Isa::sse2:
-      break;
-  }
-  return nullptr;
+  return block_steps(isa).utf32;
 }
-
-Utf32BlockStep utf32_best_block_step() {
-  static const Utf32BlockStep step = best_step(&utf32_block_step);
-  return step;
-}
-
 Utf8BlockStep utf8_best_block_step() {
-  static const Utf8BlockStep step = best_step(&utf8_block_step);
-  return step;
+  return best_block_steps().utf8;
+}
+Utf32BlockStep utf32_best_block_step() {
+  return best_block_steps().utf32;
 }
 
 void utf8_to_utf32_bulk(Utf8BlockStep step, const uint8_t *s, int64_t n, uint8_t *d, int64_t limit,
