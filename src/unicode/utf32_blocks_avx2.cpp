@@ -4,6 +4,7 @@
 // its 32-bit lane, packs the bytes in use with a byte shuffle per four
 // lanes (chosen by the lanes' lengths) into a buffer, and copies exactly
 // those bytes once the block is known to fit.
+#include "kernel/simd.hpp"
 #include "unicode/codec.hpp"
 #include "unicode/utf32_blocks.hpp"
 
@@ -65,7 +66,13 @@ alignas(16) constexpr std::array<std::array<uint8_t, 16>, 16> kUtf16Pack = make_
 
 }  // namespace
 
+}  // namespace nlssm::unicode
+
 NLSSM_TARGET_AVX2_BEGIN
+
+#include "kernel/simd_loops.hpp"
+
+namespace nlssm::unicode {
 
 namespace {
 
@@ -87,22 +94,6 @@ inline bool all_below(__m256i a, __m256i b, uint32_t bound) {
 // Sixteen units, in order, narrowed to 16 bits (each below 0x10000).
 inline __m256i narrow16(__m256i a, __m256i b) {
   return _mm256_permute4x64_epi64(_mm256_packus_epi32(a, b), 0xD8);
-}
-
-// The first `n` bytes (16 to 64: sixteen units take at least 16 bytes) of
-// `s` to `d`, writing no byte past them: two overlapping copies.
-inline void copy_exact(uint8_t *d, const uint8_t *s, int n) {
-  if (n >= 32) {
-    const __m256i head = _mm256_loadu_si256(reinterpret_cast<const __m256i *>(s));
-    const __m256i tail = _mm256_loadu_si256(reinterpret_cast<const __m256i *>(s + n - 32));
-    _mm256_storeu_si256(reinterpret_cast<__m256i *>(d), head);
-    _mm256_storeu_si256(reinterpret_cast<__m256i *>(d + n - 32), tail);
-  } else {
-    const __m128i head = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s));
-    const __m128i tail = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + n - 16));
-    _mm_storeu_si128(reinterpret_cast<__m128i *>(d), head);
-    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + n - 16), tail);
-  }
 }
 
 // Lanes above `bound` (unsigned): all ones.
@@ -193,7 +184,8 @@ int64_t encode_block(const uint8_t *p, uint8_t *d, int64_t room) {
     alignas(32) uint8_t buf[80];
     const int n = put_utf8(buf, put_utf8(buf, 0, a), b);
     if (n > room) return -1;
-    copy_exact(d, buf, n);
+    // Exactly the bytes in use: no byte past them is written.
+    ::kernel::simd::copy_short<::kernel::simd::V256>(d, buf, n);
     return n;
   } else {
     constexpr Order Out = Form == Utf32BlockForm::utf16_big ? Order::big : Order::little;
@@ -209,7 +201,7 @@ int64_t encode_block(const uint8_t *p, uint8_t *d, int64_t room) {
     alignas(32) uint8_t buf[80];
     const int n = put_utf16<Out>(buf, put_utf16<Out>(buf, 0, a), b);
     if (n > room) return -1;
-    copy_exact(d, buf, n);
+    ::kernel::simd::copy_short<::kernel::simd::V256>(d, buf, n);
     return n;
   }
 }
@@ -253,6 +245,6 @@ void utf32_blocks_avx2(const uint8_t *s, int64_t units, bool big_endian, Utf32Bl
     blocks_from<Order::little>(s, units, form, d, capacity, unit, total);
 }
 
-NLSSM_TARGET_AVX2_END
-
 }  // namespace nlssm::unicode
+
+NLSSM_TARGET_AVX2_END

@@ -20,10 +20,13 @@ namespace nlssm::unicode {
 using Utf8BlockStep = void (*)(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit,
                                bool big_endian, int64_t &consumed, int64_t &chars);
 
-// 32-byte blocks; reads three bytes past a block, so needs 35 bytes.
+// No block step does anything with fewer source bytes than this left.
+inline constexpr int64_t kUtf8BlockStepMinBytes = 48;
+
+// 32-byte blocks, reading sixteen bytes past a block.
 void utf8_blocks_avx2(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, bool big_endian,
                       int64_t &consumed, int64_t &chars);
-// 64-byte blocks.
+// 64-byte blocks, reading three bytes past a clean block.
 void utf8_blocks_avx512(const uint8_t *s, int64_t n, uint8_t *d, int64_t limit, bool big_endian,
                         int64_t &consumed, int64_t &chars);
 

@@ -9,7 +9,6 @@
 #include <cstring>
 
 #include "unicode/codec.hpp"
-#include "unicode/utf8_blocks.hpp"
 
 namespace nlssm::unicode {
 
@@ -139,7 +138,7 @@ void bulk_to_utf32(Utf8BlockStep step, const uint8_t *s, int64_t n, uint8_t *d, 
                    int64_t &consumed, int64_t &chars) {
   int64_t i = consumed, k = chars;
   while (k < limit && n - i >= 4) {
-    if (step != nullptr && n - i >= 35) {
+    if (step != nullptr && n - i >= kUtf8BlockStepMinBytes) {
       const int64_t before = i;
       step(s, n, d, limit, kIsBig<O>, i, k);
       if (i != before) continue;
