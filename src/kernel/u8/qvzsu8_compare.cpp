@@ -5,6 +5,7 @@
 
 #include <algorithm>
 
+#include "kernel/hot.hpp"
 #include "kernel/u8/case_map.hpp"
 
 namespace {
@@ -53,9 +54,7 @@ int64_t qvzsu8CaseCompare(const uint8_t *a, int64_t aLength, const uint8_t *b, i
   aLength = a == nullptr ? 0 : std::max<int64_t>(aLength, 0);
   bLength = b == nullptr ? 0 : std::max<int64_t>(bLength, 0);
   // Equal bytes fold alike: skip the common start that is whole characters.
-  int64_t same = 0;
-  const int64_t common = std::min(aLength, bLength);
-  while (same < common && a[same] == b[same]) ++same;
+  int64_t same = kernel::hot().mem_mismatch(a, b, std::min(aLength, bLength));
   while (same > 0 && (a[same - 1] >= 0x80)) --same;
   FoldedBytes x(a + same, aLength - same), y(b + same, bLength - same);
   for (;;) {
