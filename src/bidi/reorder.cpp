@@ -12,14 +12,15 @@
 #include "bidi/pairs.hpp"
 #include "bidi/uba.hpp"
 #include "catalogue/catalogue.hpp"
+#include "module/out_value.hpp"
 #include "module/work_buffer.hpp"
-#include "unicode/tables.hpp"
+#include "unicode/codec.hpp"
 
 namespace nlssm::bidi {
 namespace {
 
 // The stand-in for ill-formed input.
-constexpr uint32_t kReplacement = 0xFFFD;
+using unicode::kReplacement;
 
 struct Decoded {
   uint32_t character;
@@ -32,14 +33,20 @@ struct Decoded {
 // remaining), encode(character, out) (bytes written, at most 5), and the
 // properties (class, bracket word, mirror image) of a decoded character.
 
-class UnicodeProperties {
- public:
-  explicit UnicodeProperties(const NLSSMHandle *handle) : properties_(handle) {}
-  const CharProperties &properties(uint32_t c) { return properties_(c); }
-
- private:
-  HostProperties properties_;
+// The Unicode front ends take the properties of a character from the host.
+struct UnicodeProperties : HostProperties {
+  using HostProperties::HostProperties;
+  const CharProperties &properties(uint32_t c) { return (*this)(c); }
 };
+
+// A code point (at most U+10FFFF) in an 8-byte area through the module's
+// own encoder.
+template <typename Encoder>
+int64_t encode_with(uint32_t c, uint8_t *out) {
+  int64_t size = 0;
+  Encoder::encode(c, out, 8, &size);
+  return size;
+}
 
 struct Utf8Text : UnicodeProperties {
   static constexpr int64_t kMinSize = 1;
@@ -75,26 +82,7 @@ struct Utf8Text : UnicodeProperties {
     return {c, size, NLSSM_OK};
   }
   static int64_t encode(uint32_t c, uint8_t *out) {
-    if (c < 0x80) {
-      out[0] = static_cast<uint8_t>(c);
-      return 1;
-    }
-    if (c < 0x800) {
-      out[0] = static_cast<uint8_t>(0xC0 | c >> 6);
-      out[1] = static_cast<uint8_t>(0x80 | (c & 0x3F));
-      return 2;
-    }
-    if (c < 0x10000) {
-      out[0] = static_cast<uint8_t>(0xE0 | c >> 12);
-      out[1] = static_cast<uint8_t>(0x80 | (c >> 6 & 0x3F));
-      out[2] = static_cast<uint8_t>(0x80 | (c & 0x3F));
-      return 3;
-    }
-    out[0] = static_cast<uint8_t>(0xF0 | c >> 18);
-    out[1] = static_cast<uint8_t>(0x80 | (c >> 12 & 0x3F));
-    out[2] = static_cast<uint8_t>(0x80 | (c >> 6 & 0x3F));
-    out[3] = static_cast<uint8_t>(0x80 | (c & 0x3F));
-    return 4;
+    return encode_with<unicode::Utf8Encoder>(c, out);
   }
 };
 
@@ -117,15 +105,12 @@ struct UtfeText : UnicodeProperties {
       if (trail < 0xA0 || trail > 0xBF) return {kReplacement, k, NLSSM_E_ILL_FORMED};
       c = c << 5 | (trail & 0x1Fu);
     }
-    if (length_of(c) != size || c > 0x10FFFF || (c & 0xFFFFF800) == 0xD800)
+    if (unicode::utfe_length(c) != size || c > 0x10FFFF || (c & 0xFFFFF800) == 0xD800)
       return {kReplacement, size, NLSSM_E_ILL_FORMED};
     return {c, size, NLSSM_OK};
   }
-  static int64_t length_of(uint32_t c) {
-    return c < 0xA0 ? 1 : c < 0x400 ? 2 : c < 0x4000 ? 3 : c < 0x40000 ? 4 : 5;
-  }
   static int64_t encode(uint32_t c, uint8_t *out) {
-    const int64_t size = length_of(c);
+    const int64_t size = unicode::utfe_length(c);
     if (size == 1) {
       out[0] = unicode::i8s_utfe[c];
       return 1;
@@ -140,15 +125,10 @@ struct UtfeText : UnicodeProperties {
 template <bool kBig>
 struct Utf16Text : UnicodeProperties {
   static constexpr int64_t kMinSize = 2;
+  static constexpr unicode::Order kOrder = kBig ? unicode::Order::big : unicode::Order::little;
   using UnicodeProperties::UnicodeProperties;
 
-  static uint32_t unit(const uint8_t *p) {
-    return kBig ? uint32_t{p[0]} << 8 | p[1] : uint32_t{p[1]} << 8 | p[0];
-  }
-  static void put(uint32_t u, uint8_t *out) {
-    out[kBig ? 0 : 1] = static_cast<uint8_t>(u >> 8);
-    out[kBig ? 1 : 0] = static_cast<uint8_t>(u);
-  }
+  static uint32_t unit(const uint8_t *p) { return unicode::load16<kOrder>(p); }
   static Decoded decode(const uint8_t *p, int64_t remaining) {
     if (remaining < 2) return {kReplacement, remaining, NLSSM_E_TRUNCATED_SEQUENCE};
     const uint32_t u = unit(p);
@@ -158,31 +138,24 @@ struct Utf16Text : UnicodeProperties {
     return {kReplacement, 2, NLSSM_E_ILL_FORMED};
   }
   static int64_t encode(uint32_t c, uint8_t *out) {
-    if (c < 0x10000) {
-      put(c, out);
-      return 2;
-    }
-    put(0xD800 | (c - 0x10000) >> 10, out);
-    put(0xDC00 | (c & 0x3FF), out + 2);
-    return 4;
+    return encode_with<unicode::Utf16Encoder<kOrder>>(c, out);
   }
 };
 
 template <bool kBig>
 struct Utf32Text : UnicodeProperties {
   static constexpr int64_t kMinSize = 4;
+  static constexpr unicode::Order kOrder = kBig ? unicode::Order::big : unicode::Order::little;
   using UnicodeProperties::UnicodeProperties;
 
   static Decoded decode(const uint8_t *p, int64_t remaining) {
     if (remaining < 4) return {kReplacement, remaining, NLSSM_E_TRUNCATED_SEQUENCE};
-    const uint32_t c =
-        kBig ? uint32_t{p[0]} << 24 | uint32_t{p[1]} << 16 | uint32_t{p[2]} << 8 | p[3]
-             : uint32_t{p[3]} << 24 | uint32_t{p[2]} << 16 | uint32_t{p[1]} << 8 | p[0];
+    const uint32_t c = unicode::load32<kOrder>(p);
     if (c > 0x10FFFF || (c & 0xFFFFF800) == 0xD800) return {kReplacement, 4, NLSSM_E_ILL_FORMED};
     return {c, 4, NLSSM_OK};
   }
   static int64_t encode(uint32_t c, uint8_t *out) {
-    for (int k = 0; k < 4; ++k) out[kBig ? 3 - k : k] = static_cast<uint8_t>(c >> (8 * k));
+    unicode::store32<kOrder>(out, c);
     return 4;
   }
 };
@@ -427,7 +400,7 @@ class Reorderer {
 template <typename Text, bool kLogical>
 int64_t reorder(const NLSSMHandle *handle, const uint8_t *source, int64_t sourceBytes,
                 uint8_t *destination, int64_t capacity, int64_t *written, uint8_t *direction) {
-  if (written != nullptr) *written = 0;
+  module::store(written, 0);
   if (handle == nullptr || direction == nullptr) return NLSSM_E_NULL_ARGUMENT;
   if (sourceBytes < 0) sourceBytes = 0;
   if (capacity < 0) capacity = 0;
@@ -449,7 +422,7 @@ int64_t reorder(const NLSSMHandle *handle, const uint8_t *source, int64_t source
   *direction = static_cast<uint8_t>(paragraph);
   int64_t out = 0;
   const int64_t status = line.write(*result, destination, capacity, out);
-  if (written != nullptr) *written = out;
+  module::store(written, out);
   return status != NLSSM_OK ? status : decoded;
 }
 
