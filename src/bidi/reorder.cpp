@@ -242,8 +242,11 @@ class Reorderer {
   bool reserve(const NLSSMHandle *handle, uint64_t most) {
     // 4-byte words first (an even count keeps the resolution's work 8-byte
     // aligned), then the work, then the bytes.
-    const uint64_t words = 8 * most + 2;
-    if (!buffer_.reserve(handle, 4 * words + work_bytes(most) + 6 * most + 8)) return false;
+    // Words: the offsets (most + 1), characters, order, brackets and the
+    // three arrangements' sources (most each). Bytes: the classes, levels
+    // and the three arrangements' mirror marks (most each).
+    const uint64_t words = (7 * most + 2) & ~uint64_t{1};
+    if (!buffer_.reserve(handle, 4 * words + work_bytes(most) + 5 * most)) return false;
     auto *w = reinterpret_cast<uint32_t *>(buffer_.data());
     offsets_ = w, chars_ = w + most + 1, order_ = w + 2 * most + 1, brackets_ = w + 3 * most + 1;
     work_ = w + words;
