@@ -6,6 +6,7 @@
 
 #include "bidi/host_classes.hpp"
 #include "catalogue/catalogue.hpp"
+#include "cursor/char_model.hpp"
 
 namespace nlssm::bidi {
 namespace {
@@ -64,17 +65,6 @@ uint32_t unit32(const uint8_t *p, bool little) {
                 : uint32_t{p[0]} << 24 | uint32_t{p[1]} << 16 | uint32_t{p[2]} << 8 | p[3];
 }
 
-// Sequence length a UTF-8 first byte announces, in the six-byte scheme; a
-// continuation byte or FC-FF announces six.
-int64_t announced_length(uint8_t b) {
-  if (b < 0x80) return 1;
-  if ((b & 0xE0) == 0xC0) return 2;
-  if ((b & 0xF0) == 0xE0) return 3;
-  if ((b & 0xF8) == 0xF0) return 4;
-  if ((b & 0xFC) == 0xF8) return 5;
-  return 6;
-}
-
 constexpr uint8_t kLeadMask[6] = {0x7F, 0x1F, 0x0F, 0x07, 0x03, 0x01};
 
 }  // namespace
@@ -94,10 +84,14 @@ int64_t NLSGetBaseDirection_SBCS(const NLSSMHandle *handle, const uint8_t *text,
   });
 }
 
-// Every character is read with the length the text's first byte announces.
+// Every character is read with the length the text's first byte announces
+// in the wide scheme; a continuation byte first announces six.
 int64_t NLSGetBaseDirection_UTF8(const NLSSMHandle *handle, const uint8_t *text, int64_t length,
                                  uint8_t *direction) {
-  const int64_t n = length > 0 && text != nullptr ? nlssm::bidi::announced_length(text[0]) : 1;
+  namespace cursor = nlssm::cursor;
+  const int64_t n = length <= 0 || text == nullptr       ? 1
+                    : cursor::utf8_continuation(text[0]) ? 6
+                                                         : cursor::kUtf8FormLength[text[0]];
   return nlssm::bidi::scan(text, length, direction, [&](int64_t offset, int64_t &category) {
     if (offset + n - 1 > length) return int64_t{-1};
     uint32_t value = 0;

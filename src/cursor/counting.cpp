@@ -150,11 +150,13 @@ uint32_t modal_state_of(const NLSString *s) {
 
 // ---- Shared shapes of the members ----------------------------------------
 
+using module::store;
+
 // NLSNumChars: from the current character to the end, through the class's
 // raw-buffer rule (`state`: the modal shift state at the current character).
 template <typename CountS>
 int64_t num_chars(const NLSString *s, int64_t *count, CountS count_s) {
-  if (count != nullptr) *count = 0;
+  store(count, 0);
   if (s == nullptr || s->buffer == nullptr || count == nullptr) return kNullArgument;
   const auto length = static_cast<int64_t>(s->length);
   if (s->curOffset < 0 || s->curOffset >= length) return 0;
@@ -163,15 +165,13 @@ int64_t num_chars(const NLSString *s, int64_t *count, CountS count_s) {
 
 template <typename Fn>
 int64_t num_chars_s(const uint8_t *p, int64_t n, int64_t *count, Fn fn) {
-  if (count != nullptr) *count = 0;
+  store(count, 0);
   if (p == nullptr || count == nullptr) return kNullArgument;
   if (n <= 0) return 0;
   const Counted c = fn(p, n);
   *count = c.chars;
   return c.status;
 }
-
-using module::store;
 
 int64_t strlen8(const uint8_t *p) {
   return static_cast<int64_t>(std::strlen(reinterpret_cast<const char *>(p)));

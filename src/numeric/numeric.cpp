@@ -10,7 +10,7 @@
 #include <nlssm/nlssm.h>
 
 #include <algorithm>
-#include <array>
+#include <charconv>
 #include <cstdint>
 #include <cstring>
 
@@ -238,33 +238,13 @@ struct Field {
 // blanks on the left, the minus sign directly left of the leading digit; a
 // field of '*' when the number does not fit. A width of 0 or less asks for
 // the number's own width.
-constexpr auto kDigitPairs = [] {
-  std::array<char, 200> pairs{};
-  for (int i = 0; i < 100; ++i) {
-    pairs[2 * i] = static_cast<char>('0' + i / 10);
-    pairs[2 * i + 1] = static_cast<char>('0' + i % 10);
-  }
-  return pairs;
-}();
-
 void own_integer_field(int64_t value, int64_t width, int64_t capacity, Field &field) {
-  // The digits, two at a time from the right.
+  // The digits of the magnitude (2^63 at most: 19 digits).
   char buffer[20];
-  char *const end = buffer + sizeof buffer;
-  char *first = end;
-  uint64_t magnitude = value < 0 ? 0 - static_cast<uint64_t>(value) : static_cast<uint64_t>(value);
-  while (magnitude >= 100) {
-    first -= 2;
-    std::memcpy(first, &kDigitPairs[2 * (magnitude % 100)], 2);
-    magnitude /= 100;
-  }
-  if (magnitude >= 10) {
-    first -= 2;
-    std::memcpy(first, &kDigitPairs[2 * magnitude], 2);
-  } else {
-    *--first = static_cast<char>('0' + magnitude);
-  }
-  const int64_t n = end - first;
+  const uint64_t magnitude =
+      value < 0 ? 0 - static_cast<uint64_t>(value) : static_cast<uint64_t>(value);
+  const char *const end = std::to_chars(buffer, buffer + sizeof buffer, magnitude).ptr;
+  const int64_t n = end - buffer;
   const int64_t needed = n + (value < 0 ? 1 : 0);
   if (width <= 0) width = std::min(needed, capacity);
   if (needed > width) {
@@ -275,7 +255,7 @@ void own_integer_field(int64_t value, int64_t width, int64_t capacity, Field &fi
   std::fill_n(field.chars, width - needed, uint32_t{' '});
   uint32_t *p = field.chars + (width - needed);
   if (value < 0) *p++ = '-';
-  std::copy(first, end, p);
+  std::copy(buffer, buffer + n, p);
   field.count = width;
   field.status = 0;
 }
