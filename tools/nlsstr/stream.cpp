@@ -152,8 +152,12 @@ size_t Reader::fill(size_t want) {
       end_ -= begin_;
       begin_ = 0;
     }
-    if (end_ == buffer_.size())  // full: grow by doubling, towards what is wanted
-      buffer_.resize(std::max(kPieceBytes, std::min(want, 2 * buffer_.size())));
+    if (end_ == buffer_.size()) {
+      // Full: grow by doubling, as far as what is wanted or the longest text
+      // taken whole, so that a long line is read in ever larger pieces.
+      const size_t most = std::max(want, kWholeLimit + 1);
+      buffer_.resize(std::max(kPieceBytes, std::min(2 * buffer_.size(), most)));
+    }
     const ssize_t got = read(fd_, buffer_.data() + end_, buffer_.size() - end_);
     if (got < 0) {
       if (errno == EINTR) continue;
@@ -248,14 +252,17 @@ std::vector<uint8_t> Stream::next(const NLSSMHandle *h) {
       return text;
     }
     case Split::kLines: {
-      size_t width = 0, at = 0, want = 1;
+      // Only the bytes read since the last look are searched again.
+      size_t width = 0, at = 0, want = 1, searched = 0;
       for (;;) {
         reader_.fill(want);
-        at = boundaries_->newline(reader_.data(), reader_.available(), width);
-        if (at < reader_.available() || reader_.available() < want) break;  // found, or the end
-        if (reader_.available() > kWholeLimit)
-          throw Failure("a line is longer than 64 MiB", 0, kExitInput);
-        want = reader_.available() + 1;
+        const size_t available = reader_.available();
+        at =
+            searched + boundaries_->newline(reader_.data() + searched, available - searched, width);
+        if (at < available || available < want) break;  // found, or the end
+        if (available > kWholeLimit) throw Failure("a line is longer than 64 MiB", 0, kExitInput);
+        searched = available - available % width;
+        want = available + 1;
       }
       const size_t end = std::min(at, reader_.available());
       std::vector<uint8_t> text(reader_.data(), reader_.data() + end);
