@@ -12,6 +12,7 @@
 #include "casecmp/case_walk.hpp"
 #include "casecmp/table_map.hpp"
 #include "kernel/hot.hpp"
+#include "unicode/codec.hpp"
 #include "unicode/tables.hpp"
 
 namespace nlssm::casecmp {
@@ -168,10 +169,6 @@ int64_t ascii_run(const uint8_t *p, int64_t n) {
   return i;
 }
 
-constexpr int64_t utf8_length(uint32_t c) {
-  return c < 0x80 ? 1 : c < 0x800 ? 2 : c < 0x10000 ? 3 : 4;
-}
-
 enum class Utf8Form : uint8_t { kSpan, kChars };
 
 // Up to `limit` characters of the `n` bytes at p, read at r and written at
@@ -204,7 +201,7 @@ void walk_utf8(const NLSSMHandle *h, Case c, uint8_t *p, int64_t n, int64_t limi
         UTF8_UTF32(p + r, available, &cp, &consumed) != NLSSM_OK)
       break;
     const uint32_t to = host_case(cp);
-    const int64_t size = to != 0 ? utf8_length(to) : consumed;
+    const int64_t size = to != 0 ? unicode::utf8_length_of(to) : consumed;
     if (size > n - w) break;
     if (to != 0) {
       int64_t written = 0;

@@ -6,6 +6,7 @@
 
 #include "casecmp/case_walk.hpp"
 #include "casecmp/table_map.hpp"
+#include "module/out_value.hpp"
 
 namespace nlssm::casecmp {
 namespace {
@@ -200,9 +201,7 @@ RawCopy raw_copy(int64_t sourceBytes, int64_t capacity) {
 bool raw_null(const uint8_t *src, const uint8_t *dst, int64_t n) {
   return n > 0 && (src == nullptr || dst == nullptr);
 }
-void store(int64_t *written, int64_t n) {
-  if (written != nullptr) *written = n;
-}
+using module::store;
 
 int64_t normalize_s_sbcs(const NLSSMHandle *h, const uint8_t *src, int64_t sourceBytes,
                          uint8_t *dst, int64_t capacity, int64_t *written, uint32_t options) {

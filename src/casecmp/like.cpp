@@ -41,7 +41,7 @@ bool is_special(const Specials &sp, int which, const uint8_t *base, Char c) {
 }
 
 template <class M>
-int64_t like(const M &m, Span t, Span p, const Specials &sp, bool escape) {
+int64_t like(const M &m, TextSpan t, TextSpan p, const Specials &sp, bool escape) {
   using W = Walk<M>;
   W tw(m, t.p, t.n, 0, t.state);
   W pw(m, p.p, p.n, 0, p.state);
@@ -100,8 +100,8 @@ int64_t like_plain(const NLSSMHandle *h, const NLSString *text, const NLSString 
   for (const NLSString *s : {text, pattern})
     if (s->buffer == nullptr && s->curOffset >= 0 && s->length > 0) return NLSSM_E_NULL_ARGUMENT;
   static const uint8_t kNothing = 0;
-  Span t = from_current(text);
-  Span p = from_current(pattern);
+  TextSpan t = from_current(text);
+  TextSpan p = from_current(pattern);
   if (!t.valid) t = {&kNothing, 0, kModalSingle, true};
   if (!p.valid) p = {&kNothing, 0, kModalSingle, true};
   return like(M(h), t, p, specials_for<M>(h, ebcdic), escape != 0);
@@ -150,13 +150,13 @@ extern "C" int64_t NLSStringLike_MBCS_modal(const NLSSMHandle *h, const NLSStrin
 extern "C" int64_t NLSStringLike_MBCS_nonmodal2_ASCII(const NLSSMHandle *h, const NLSString *text,
                                                       const NLSString *pattern, int64_t escape) {
   if (h == nullptr) return NLSSM_E_NULL_ARGUMENT;
-  return with_dbcs_model(
+  return nlssm::cursor::with_nonmodal_model(
       h, [&](auto m) { return like_plain<NLSSM_MODEL_OF(m)>(h, text, pattern, escape, false); });
 }
 
 extern "C" int64_t NLSStringLike_MBCS_nonmodal2_EBCDIC(const NLSSMHandle *h, const NLSString *text,
                                                        const NLSString *pattern, int64_t escape) {
   if (h == nullptr) return NLSSM_E_NULL_ARGUMENT;
-  return with_dbcs_model(
+  return nlssm::cursor::with_nonmodal_model(
       h, [&](auto m) { return like_plain<NLSSM_MODEL_OF(m)>(h, text, pattern, escape, true); });
 }

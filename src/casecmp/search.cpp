@@ -10,6 +10,7 @@
 #include "casecmp/search_vector.hpp"
 #include "casecmp/text_walk.hpp"
 #include "cursor/count_vector.hpp"
+#include "cursor/counting.hpp"
 #include "module/literal.hpp"
 
 namespace nlssm::casecmp {
@@ -36,7 +37,7 @@ inline constexpr bool kIsWcs2 =
 // with the pattern's. Modal text needs it (the same bytes mean different
 // characters in single- and double-byte mode).
 template <class M>
-int64_t index_naive(const M &m, Span s, Span p) {
+int64_t index_naive(const M &m, TextSpan s, TextSpan p) {
   Walk<M> w(m, s.p, s.n, 0, s.state);
   for (int64_t index = 0; !w.done(); w.next(), ++index) {
     Walk<M> a = w;
@@ -56,7 +57,7 @@ int64_t index_naive(const M &m, Span s, Span p) {
 template <class M>
 void advance(Walk<M> &w, int64_t target, int64_t &index) {
   if constexpr (std::is_same_v<M, Utf8Model>) {
-    static const cursor::simd::Isa isa = cursor::simd::best_isa();
+    const cursor::simd::Isa isa = cursor::active_isa();
     while (w.offset() < target && !w.done()) {
       if (target - w.offset() >= 64) {
         const auto prefix =
@@ -83,26 +84,11 @@ bool ends_on_boundary(Walk<M> w, int64_t end) {
   return w.offset() == end;
 }
 
-// Number of characters in UTF-16 units [0, bytes): a high surrogate
-// followed by a low one counts once.
-template <bool kBig>
-int64_t wcs2_chars(const uint8_t *p, int64_t bytes) {
-  int64_t pairs = 0;
-  for (int64_t i = 0; i + 4 <= bytes; i += 2) {
-    if (Wcs2Model<kBig>::high(Wcs2Model<kBig>::unit_at(p + i)) &&
-        Wcs2Model<kBig>::low(Wcs2Model<kBig>::unit_at(p + i + 2))) {
-      ++pairs;
-      i += 2;
-    }
-  }
-  return (bytes + 1) / 2 - pairs;
-}
-
 // The character index of the first match of pattern p (at least one byte)
 // in text s (at least one character), or -1. Candidates come from the
 // vector byte search and are kept only on character boundaries.
 template <class M>
-int64_t index_in(const M &m, Span s, Span p) {
+int64_t index_in(const M &m, TextSpan s, TextSpan p) {
   if constexpr (M::kModal) {
     return index_naive(m, s, p);
   } else if constexpr (std::is_same_v<M, SbcsModel>) {
@@ -121,7 +107,8 @@ int64_t index_in(const M &m, Span s, Span p) {
       const int64_t end = q + p.n;
       const bool splits_start = q >= 2 && M::high(unit(q - 2)) && M::low(unit(q));
       const bool splits_end = end + 2 <= s.n && M::high(unit(end - 2)) && M::low(unit(end));
-      if (!splits_start && !splits_end) return wcs2_chars<kBig>(s.p, q);
+      if (!splits_start && !splits_end)
+        return cursor::count_wcs2(cursor::active_isa(), s.p, q, kBig);
       from = q + 2;
     }
   } else {
@@ -140,7 +127,7 @@ int64_t index_in(const M &m, Span s, Span p) {
 // Texts measured, with the rules every Index form shares: no text
 // character gives -1, an empty pattern is found at the start.
 template <class M>
-int64_t index_spans(const M &m, Span s, Span p) {
+int64_t index_spans(const M &m, TextSpan s, TextSpan p) {
   if (Walk<M>(m, s.p, s.n, 0, s.state).done()) return -1;
   if (p.n == 0) return 0;
   return index_in(m, s, p);
@@ -149,8 +136,8 @@ int64_t index_spans(const M &m, Span s, Span p) {
 template <class M>
 int64_t index_plain(const NLSSMHandle *h, const NLSString *s, const NLSString *p,
                     int64_t patternChars) {
-  Span ts = from_current(s);
-  Span ps = from_current(p);
+  TextSpan ts = from_current(s);
+  TextSpan ps = from_current(p);
   if (!ts.valid || !ps.valid) return -1;
   const M m(h);
   ps.n = span_of(m, ps.p, ps.n, patternChars, ps.state);
@@ -164,8 +151,8 @@ int64_t index_raw(const NLSSMHandle *h, const uint8_t *s, int64_t sLength, const
   if (pLength == 0) return 0;
   if (sLength <= 0 || pLength < 0 || s == nullptr || p == nullptr) return -1;
   const M m(h);
-  Span ts{s, sLength, kModalSingle, true};
-  Span ps{p, pLength, kModalSingle, true};
+  TextSpan ts{s, sLength, kModalSingle, true};
+  TextSpan ps{p, pLength, kModalSingle, true};
   if constexpr (kChars) {
     ts.n = span_of(m, s, kUnbounded, sLength, kModalSingle);
     ps.n = span_of(m, p, kUnbounded, pLength, kModalSingle);
@@ -178,7 +165,7 @@ int64_t index_raw(const NLSSMHandle *h, const uint8_t *s, int64_t sLength, const
 // The first character of `literal` (its bytes as the encoding announces
 // them, after any shift sequence), as a one-character pattern.
 template <class M>
-Span first_char(const M &m, const uint8_t *literal, int64_t length) {
+TextSpan first_char(const M &m, const uint8_t *literal, int64_t length) {
   if (literal == nullptr || length <= 0) return {};
   Walk<M> w(m, literal, length);
   if (w.done()) return {};
@@ -195,10 +182,11 @@ constexpr int64_t kLiteralBytes = M::kModal ? 6 : 4;
 // literal set (converted when `convert`) or a character of the text's
 // encoding.
 template <class M>
-int64_t find_char(const NLSSMHandle *h, const M &m, Span s, const uint8_t *literal, bool convert) {
+int64_t find_char(const NLSSMHandle *h, const M &m, TextSpan s, const uint8_t *literal,
+                  bool convert) {
   if (!s.valid || literal == nullptr) return -1;
   module::ConvertedLiteral<16> converted;
-  Span c;
+  TextSpan c;
   if (convert && h->charConverter != nullptr) {
     if (converted.convert(h, literal, 1) != module::LiteralOutcome::kConverted) return -1;
     c = first_char(m, converted.text(), static_cast<int64_t>(converted.length()));
@@ -211,7 +199,7 @@ int64_t find_char(const NLSSMHandle *h, const M &m, Span s, const uint8_t *liter
 
 template <class M>
 int64_t find_char_plain(const NLSSMHandle *h, NLSString *s, int64_t count, const uint8_t *literal) {
-  Span ts = from_current(s);
+  TextSpan ts = from_current(s);
   if (!ts.valid) return -1;
   const M m(h);
   ts.n = span_of(m, ts.p, ts.n, count, ts.state);
@@ -242,7 +230,7 @@ int64_t find_char_raw(const NLSSMHandle *h, const uint8_t *text, int64_t length,
   if (text == nullptr || length <= 0) return -1;
   const M m(h);
   const int64_t bytes = kChars ? span_of(m, text, kUnbounded, length, kModalSingle) : length;
-  return find_char(h, m, Span{text, bytes, kModalSingle, true}, literal, convert);
+  return find_char(h, m, TextSpan{text, bytes, kModalSingle, true}, literal, convert);
 }
 
 // One byte of the single-byte search: the literal byte, converted when
@@ -269,7 +257,7 @@ int64_t sbcs_find_raw(const NLSSMHandle *h, const uint8_t *text, int64_t length,
 // ---- Verify ------------------------------------------------------------------
 
 template <class M>
-int64_t verify_in(const M &m, Span s, int64_t count, Span set, int64_t setCount) {
+int64_t verify_in(const M &m, TextSpan s, int64_t count, TextSpan set, int64_t setCount) {
   if (!s.valid) return -1;
   Walk<M> w(m, s.p, s.n, 0, s.state);
   if (w.done()) return -1;
@@ -294,9 +282,9 @@ template <class M>
 int64_t verify_raw(const NLSSMHandle *h, const uint8_t *s, int64_t length, const uint8_t *set,
                    int64_t setLength) {
   if (s == nullptr || length <= 0) return -1;
-  const Span setSpan{set, set == nullptr ? 0 : std::max<int64_t>(setLength, 0), kModalSingle,
-                     set != nullptr};
-  return verify_in(M(h), Span{s, length, kModalSingle, true}, 0, setSpan, 0);
+  const TextSpan setSpan{set, set == nullptr ? 0 : std::max<int64_t>(setLength, 0), kModalSingle,
+                         set != nullptr};
+  return verify_in(M(h), TextSpan{s, length, kModalSingle, true}, 0, setSpan, 0);
 }
 
 // Single-byte: bytes [0, n) limited to `count` when that is given and not
@@ -527,8 +515,8 @@ extern "C" int64_t NLSStringFindCharC_MBCS_modal(const NLSSMHandle *h, const uin
 
 extern "C" int64_t NLSStringVerify_SBCS(const NLSSMHandle *, const NLSString *s, int64_t count,
                                         const NLSString *set, int64_t setCount) {
-  const Span ts = from_current(s);
-  const Span ss = from_current(set);
+  const TextSpan ts = from_current(s);
+  const TextSpan ss = from_current(set);
   if (!ts.valid) return -1;
   return sbcs_verify(ts.p, limit_bytes(ts.n, count), ss.p,
                      ss.valid ? limit_bytes(ss.n, setCount) : 0);
@@ -575,13 +563,13 @@ extern "C" int64_t NLSStringVerifyS_UTF8(const NLSSMHandle *h, const uint8_t *s,
 extern "C" int64_t NLSStringVerify_MBCS_nonmodal(const NLSSMHandle *h, const NLSString *s,
                                                  int64_t count, const NLSString *set,
                                                  int64_t setCount) {
-  return with_dbcs_model(
+  return nlssm::cursor::with_nonmodal_model(
       h, [&](auto m) { return verify_plain<NLSSM_MODEL_OF(m)>(h, s, count, set, setCount); });
 }
 
 extern "C" int64_t NLSStringVerifyS_MBCS_nonmodal(const NLSSMHandle *h, const uint8_t *s,
                                                   int64_t length, const uint8_t *set,
                                                   int64_t setLength) {
-  return with_dbcs_model(
+  return nlssm::cursor::with_nonmodal_model(
       h, [&](auto m) { return verify_raw<NLSSM_MODEL_OF(m)>(h, s, length, set, setLength); });
 }

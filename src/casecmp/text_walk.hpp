@@ -135,24 +135,19 @@ decltype(auto) with_wcs2_model(const NLSSMHandle *h, Fn &&fn) {
   return fn(cursor::Wcs2Model<false>(h));
 }
 
-template <class Fn>
-decltype(auto) with_dbcs_model(const NLSSMHandle *h, Fn &&fn) {
-  return cursor::with_nonmodal_model(h, fn);
-}
-
 // The model type a dispatcher hands to its function.
 #define NLSSM_MODEL_OF(m) std::remove_cvref_t<decltype(m)>
 
 // The text of a descriptor from its current character: none when the
 // descriptor has no current character.
-struct Span {
+struct TextSpan {
   const uint8_t *p = nullptr;
   int64_t n = 0;
   uint32_t state = kModalSingle;
   bool valid = false;
 };
 
-inline Span from_current(const NLSString *s) {
+inline TextSpan from_current(const NLSString *s) {
   if (s == nullptr || s->buffer == nullptr || s->curOffset < 0) return {};
   const auto length = static_cast<int64_t>(s->length);
   const int64_t n = s->curOffset < length ? length - s->curOffset : 0;
