@@ -66,6 +66,20 @@ inline bool span_from(const NLSString *s, int64_t start, Span &out) {
   return true;
 }
 
+// The text of each descriptor from its current character; false when
+// either has none.
+inline bool descriptor_spans(const NLSString *sa, const NLSString *sb, Span &a, Span &b) {
+  return sa != nullptr && sb != nullptr && sa->curOffset >= 0 && sb->curOffset >= 0 &&
+         span_from(sa, sa->curOffset, a) && span_from(sb, sb->curOffset, b);
+}
+
+// A raw buffer of n bytes (none below 0); false when it is missing.
+inline bool raw_span(const uint8_t *p, int64_t n, Span &out) {
+  if (p == nullptr && n > 0) return false;
+  out = {p, std::max<int64_t>(n, 0)};
+  return true;
+}
+
 // A descriptor over a converted literal, on its first character (none when
 // it is empty), in single-byte shift state.
 inline NLSString text_descriptor(const uint8_t *text, int64_t bytes) {

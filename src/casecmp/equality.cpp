@@ -76,10 +76,7 @@ int64_t equals_bytes(const NLSSMHandle *h, const M &m, Span a, Span b, int64_t c
 }
 
 bool raw_spans(const uint8_t *pa, int64_t la, const uint8_t *pb, int64_t lb, Span &a, Span &b) {
-  if ((pa == nullptr && la > 0) || (pb == nullptr && lb > 0)) return false;
-  a = {pa, std::max<int64_t>(la, 0)};
-  b = {pb, std::max<int64_t>(lb, 0)};
-  return true;
+  return raw_span(pa, la, a) && raw_span(pb, lb, b);
 }
 
 // Character counts of the C forms become byte lengths (no byte limit).
@@ -174,11 +171,6 @@ int64_t equals_wide(const NLSSMHandle *h, Span a, Span b, int64_t count, int32_t
   const Tail tail = unit_tail(h, width, big);
   uint32_t other = 0;
   return tail.first_other(longer.p, common, longer.n, other) < 0 ? 1 : 0;
-}
-
-bool descriptor_spans(const NLSString *sa, const NLSString *sb, Span &a, Span &b) {
-  return sa != nullptr && sb != nullptr && sa->curOffset >= 0 && sb->curOffset >= 0 &&
-         span_from(sa, sa->curOffset, a) && span_from(sb, sb->curOffset, b);
 }
 
 int64_t wide_chars_to_bytes(const NLSSMHandle *h, const uint8_t *p, int64_t chars) {

@@ -98,19 +98,6 @@ int64_t not_equal_chars(const M &m, Span s, uint32_t state, int64_t count, Span 
   return first_not_in_chars(m, s, state, count, chars, counts);
 }
 
-// The text of each descriptor from its current character; false when
-// either has none.
-bool spans(const NLSString *s, const NLSString *set, Span &a, Span &b) {
-  return s != nullptr && set != nullptr && s->curOffset >= 0 && set->curOffset >= 0 &&
-         span_from(s, s->curOffset, a) && span_from(set, set->curOffset, b);
-}
-
-bool raw(const uint8_t *p, int64_t n, Span &out) {
-  if (p == nullptr && n > 0) return false;
-  out = {p, std::max<int64_t>(n, 0)};
-  return true;
-}
-
 // Runs `fn(model, counts)` with the character model of a class: UTF-8 or
 // UTF-EBCDIC for class 1, WCS2 in its byte order, or the non-modal sets.
 template <class Fn>
@@ -131,7 +118,7 @@ int64_t with_class_model(const NLSSMHandle *h, Fn fn) {
 int64_t not_equal(const NLSSMHandle *h, const NLSString *s, int64_t count, const NLSString *set,
                   int64_t setLength) {
   Span a, b;
-  if (!spans(s, set, a, b)) return 0;
+  if (!descriptor_spans(s, set, a, b)) return 0;
   return with_class_model(h, [&](const auto &m, auto counts) {
     return not_equal_chars(m, a, modal_start(s), count, b, modal_start(set), setLength, counts);
   });
@@ -140,7 +127,7 @@ int64_t not_equal(const NLSSMHandle *h, const NLSString *s, int64_t count, const
 int64_t not_equal_s(const NLSSMHandle *h, const uint8_t *s, int64_t n, const uint8_t *set,
                     int64_t setBytes) {
   Span a, b;
-  if (!raw(s, n, a) || !raw(set, setBytes, b)) return 0;
+  if (!raw_span(s, n, a) || !raw_span(set, setBytes, b)) return 0;
   return with_class_model(h, [&](const auto &m, auto counts) {
     return not_equal_chars(m, a, cursor::kModalSingle, 0, b, cursor::kModalSingle, 0, counts);
   });
@@ -171,7 +158,7 @@ int64_t NLSStringNotEqual_SBCS(const NLSSMHandle *h, const NLSString *s, int64_t
                                const NLSString *set, int64_t setLength) {
   (void)h;
   cc::Span a, b;
-  if (!cc::spans(s, set, a, b)) return 0;
+  if (!cc::descriptor_spans(s, set, a, b)) return 0;
   if (count > 0 && count <= a.n) a.n = count;
   if (setLength > 0 && setLength <= b.n) b.n = setLength;
   return cc::first_not_in_bytes(a, b);
@@ -180,7 +167,7 @@ int64_t NLSStringNotEqualS_SBCS(const NLSSMHandle *h, const uint8_t *s, int64_t 
                                 const uint8_t *set, int64_t setBytes) {
   (void)h;
   cc::Span a, b;
-  if (setBytes <= 0 || !cc::raw(s, n, a) || !cc::raw(set, setBytes, b)) return 0;
+  if (setBytes <= 0 || !cc::raw_span(s, n, a) || !cc::raw_span(set, setBytes, b)) return 0;
   return cc::first_not_in_bytes(a, b);
 }
 
