@@ -150,10 +150,7 @@ void map_bytes(MapIsa isa, const uint8_t *table, const uint8_t *src, uint8_t *ds
   if (n <= 0) return;
   int64_t done = 0;
   if (isa == MapIsa::kAvx512) {
-    const auto misaligned = static_cast<int64_t>(reinterpret_cast<uintptr_t>(dst) & 63);
-    const int64_t head = std::min<int64_t>(n, misaligned == 0 ? 0 : 64 - misaligned);
-    map_bytes_scalar(table, src, dst, head);
-    done = head + detail::map_blocks_avx512(table, src + head, dst + head, n - head);
+    done = detail::map_bytes_avx512(table, src, dst, n);
   } else if (isa != MapIsa::kScalar && n >= kVectorBytes) {
     MapPlan own;
     const MapPlan *plan = catalogue_plan(table);

@@ -53,8 +53,8 @@ namespace detail {
 // pieces only and answers 0 when the plan has none usable.
 int64_t map_blocks_sse2(const MapPlan &plan, const uint8_t *src, uint8_t *dst, int64_t n);
 int64_t map_blocks_avx2(const MapPlan &plan, const uint8_t *src, uint8_t *dst, int64_t n);
-// dst must be 64-byte aligned.
-int64_t map_blocks_avx512(const uint8_t *table, const uint8_t *src, uint8_t *dst, int64_t n);
+// Every byte (answers n).
+int64_t map_bytes_avx512(const uint8_t *table, const uint8_t *src, uint8_t *dst, int64_t n);
 }  // namespace detail
 
 }  // namespace nlssm::casecmp

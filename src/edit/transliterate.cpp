@@ -1,13 +1,14 @@
 // Transliterate: copy a source into a destination, replacing each character
 // found in the from-list by the to-list's character at the same index (the
 // first match wins). Single-byte text maps through a 256-entry table built
-// once per call; the other classes search the from-list per character, but
-// only for characters whose first byte starts some from-list character.
+// once per call, by the byte mapper of the case tables; the other classes
+// search the from-list per character, but only for characters whose first
+// byte starts some from-list character.
 #include <nlssm/nlssm.h>
 
 #include <cstdint>
 
-#include "edit/byte_map.hpp"
+#include "casecmp/table_map.hpp"
 #include "edit/copy_engines.hpp"
 
 namespace nlssm::edit {
@@ -29,10 +30,6 @@ int64_t pair_count(const C &c, const TranslitArgs &a) {
   return a.pairs > 0 && a.pairs < lists ? a.pairs : lists;
 }
 
-// Texts shorter than this (records of a few dozen bytes) map byte by byte:
-// preparing the vector paths would cost more than they save.
-constexpr int64_t kShortText = 256;
-
 Result transliterate_bytes(const TranslitArgs &a, int64_t pairs, uint8_t *out, int64_t room) {
   uint8_t map[256];
   for (int b = 0; b < 256; ++b) map[b] = static_cast<uint8_t>(b);
@@ -40,7 +37,7 @@ Result transliterate_bytes(const TranslitArgs &a, int64_t pairs, uint8_t *out, i
   int64_t count = a.src.length;
   if (a.n > 0 && a.n < count) count = a.n;
   const int64_t done = count < room ? count : room;
-  ByteMap(map, done < kShortText ? MapIsa::kScalar : best_map_isa()).apply(a.src.p, out, done);
+  casecmp::map_bytes(map, a.src.p, out, done);
   return {count > room ? kDestTooSmall : kOk, done};
 }
 
@@ -105,6 +102,10 @@ class Pairs {
   Char from_[kCached], to_[kCached];
 };
 
+// Shorter runs of single-byte characters map byte by byte: words between
+// other characters are short, and setting a vector path up would cost more.
+constexpr int64_t kVectorRun = 64;
+
 template <class C>
 Result transliterate(const C &c, const TranslitArgs &a, uint8_t *out, int64_t room, bool dbl) {
   const int64_t pairs = pair_count(c, a);
@@ -112,8 +113,7 @@ Result transliterate(const C &c, const TranslitArgs &a, uint8_t *out, int64_t ro
     return transliterate_bytes(a, pairs, out, room);
   } else {
     const Pairs<C> table(c, a, pairs);
-    const bool vector = Pairs<C>::kByteRuns && a.src.length >= kShortText;
-    const ByteMap bytes(table.bytes, vector ? best_map_isa() : MapIsa::kScalar);
+    const casecmp::MapIsa isa = casecmp::best_map_isa();
     Reader<C> src(c, a.src);
     Writer<C> w(c, out, room, dbl);
     int64_t left = a.n > 0 ? a.n : -1;
@@ -125,7 +125,8 @@ Result transliterate(const C &c, const TranslitArgs &a, uint8_t *out, int64_t ro
         while (run < limit && table.runs[src.p[run]]) ++run;
         if (run > src.off) {
           const int64_t take = run - src.off < w.left() ? run - src.off : w.left();
-          bytes.apply(src.p + src.off, w.claim(take), take);
+          casecmp::map_bytes(take < kVectorRun ? casecmp::MapIsa::kScalar : isa, table.bytes,
+                             src.p + src.off, w.claim(take), take);
           src.off += take;
           if (left > 0) left -= take;
           if (src.off < run) return {kDestTooSmall, w.finish()};
