@@ -202,10 +202,7 @@ struct Utf8Codec {
 // UTF-EBCDIC: bytes map to I8 form, whose leads announce 0-4 trailing bytes
 // of five bits each.
 struct UtfeCodec {
-  static int64_t length(uint8_t b) {
-    const int64_t n = cursor::kSkipUtfe[b];
-    return n == 0 ? 1 : n;
-  }
+  static int64_t length(uint8_t b) { return cursor::utfe_char_length(b); }
   static bool continuation(uint8_t b) { return cursor::utfe_trailing(b); }
   static bool counts(uint8_t) { return true; }
   static Decoded decode(const uint8_t *p, int64_t remaining) {

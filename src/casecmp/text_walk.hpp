@@ -18,15 +18,7 @@ namespace nlssm::casecmp {
 
 using cursor::kModalSingle;
 
-// UTF-EBCDIC by its skip table: a trailing byte or an unused lead stands
-// alone as a one-byte character.
-struct UtfeModel : cursor::StatelessModel {
-  explicit UtfeModel(const NLSSMHandle * = nullptr) {}
-  int64_t step(const uint8_t *p, int64_t, uint32_t) const {
-    const int64_t n = cursor::kSkipUtfe[*p];
-    return n == 0 ? 1 : n;
-  }
-};
+using UtfeModel = cursor::UtfeStepModel;
 
 // One character: where it starts, its bytes (never past the end of the
 // text) and, in modal text, whether it is a double-byte character.

@@ -145,6 +145,19 @@ struct Wcs2Model : StatelessModel {
   }
 };
 
+// Bytes of the UTF-EBCDIC character a byte starts by the skip table; a
+// trailing byte or an unused lead stands alone.
+constexpr int64_t utfe_char_length(uint8_t b) {
+  const int64_t n = kSkipUtfe[b];
+  return n == 0 ? 1 : n;
+}
+
+// Stepping view of UTF-EBCDIC by its skip table.
+struct UtfeStepModel : StatelessModel {
+  explicit UtfeStepModel(const NLSSMHandle * = nullptr) {}
+  int64_t step(const uint8_t *p, int64_t, uint32_t) const { return utfe_char_length(*p); }
+};
+
 // Stepping view of UTF-8 (and of UTF-EBCDIC, which class 1 steps alike):
 // the lead-length table; a byte it rejects is a one-byte character.
 struct Utf8StepModel : StatelessModel {

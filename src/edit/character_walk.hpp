@@ -16,15 +16,7 @@ namespace nlssm::edit {
 
 inline constexpr int64_t kUnset = NLSSM_POS_NONE;
 
-// UTF-EBCDIC characters by the skip table; a trailing byte or an unused lead
-// stands alone.
-struct UtfeStepModel : cursor::StatelessModel {
-  explicit UtfeStepModel(const NLSSMHandle * = nullptr) {}
-  int64_t step(const uint8_t *p, int64_t, uint32_t) const {
-    const int64_t n = cursor::kSkipUtfe[*p];
-    return n == 0 ? 1 : n;
-  }
-};
+using cursor::UtfeStepModel;
 
 // Calls fn with the character model of a multi-byte non-modal handle: UTF-8
 // (encoding 20), UTF-EBCDIC (the rest of class 1), EUC-JP, EUC-TW, GB18030,
