@@ -29,10 +29,6 @@ bool all_blank(const uint8_t *p, int64_t n, const uint8_t *blank, int64_t width)
   return true;
 }
 
-int64_t blank_width(const NLSSMHandle *h) {
-  return h->blankWidth == 2 || h->blankWidth == 4 ? static_cast<int64_t>(h->blankWidth) : 1;
-}
-
 // The byte-oriented pad of the descriptor forms: from the current character
 // (or the end of the text), `byteCount` bytes or up to the capacity, in
 // whole units of `unit` bytes.

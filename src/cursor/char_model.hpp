@@ -145,6 +145,11 @@ struct Wcs2Model : StatelessModel {
   }
 };
 
+// Bytes of the handle's blank: 2 or 4 where it says so, else 1.
+inline int64_t blank_width(const NLSSMHandle *h) {
+  return h->blankWidth == 2 || h->blankWidth == 4 ? static_cast<int64_t>(h->blankWidth) : 1;
+}
+
 // Bytes of the UTF-EBCDIC character a byte starts by the skip table; a
 // trailing byte or an unused lead stands alone.
 constexpr int64_t utfe_char_length(uint8_t b) {

@@ -10,6 +10,7 @@
 #include <cstring>
 
 #include "cursor/char_model.hpp"
+#include "edit/text_model.hpp"
 #include "module/out_value.hpp"
 
 namespace nlssm::edit {
@@ -70,23 +71,12 @@ inline Remaining remaining_of(const NLSString *s) {
   return {s->buffer + s->curOffset, length - s->curOffset};
 }
 
-inline int64_t blank_width(const NLSSMHandle *h) {
-  return h->blankWidth == 2 || h->blankWidth == 4 ? static_cast<int64_t>(h->blankWidth) : 1;
-}
-
 // Fills `bytes` bytes with the handle's blank, whole blanks first; a tail
 // shorter than a blank gets the blank's first bytes.
 inline void fill_blanks(const NLSSMHandle *h, uint8_t *p, int64_t bytes) {
-  const int64_t width = blank_width(h);
   if (bytes <= 0) return;
-  if (width == 1) {
-    std::memset(p, h->blankChar[0], static_cast<size_t>(bytes));
-    return;
-  }
-  int64_t off = 0;
-  for (; off + width <= bytes; off += width)
-    std::memcpy(p + off, h->blankChar, static_cast<size_t>(width));
-  std::memcpy(p + off, h->blankChar, static_cast<size_t>(bytes - off));
+  const int64_t whole = pad_blanks(p, bytes, Blank(h));
+  std::memcpy(p + whole, h->blankChar, static_cast<size_t>(bytes - whole));
 }
 
 using module::store;

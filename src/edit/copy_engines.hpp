@@ -11,16 +11,12 @@
 #include <cstring>
 
 #include "cursor/char_model.hpp"
+#include "edit/statuses.hpp"
 #include "module/literal.hpp"
 #include "module/out_value.hpp"
 #include "module/work_buffer.hpp"
 
 namespace nlssm::edit {
-
-inline constexpr int64_t kOk = 0;
-inline constexpr int64_t kDestTooSmall = NLSSM_E_DEST_TOO_SMALL;
-inline constexpr int64_t kNullArgument = NLSSM_E_NULL_ARGUMENT;
-inline constexpr int64_t kNoMemory = NLSSM_E_NO_MEMORY;
 
 // Bytes a work buffer for an overlapping destination may use on the stack.
 inline constexpr uint64_t kOverlapStack = 2048;

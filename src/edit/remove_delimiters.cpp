@@ -19,10 +19,10 @@ template <class C>
 Result remove_delimiters(const C &c, const DelimiterArgs &a, uint8_t *out, int64_t room, bool dbl) {
   Reader<C> src(c, a.src);
   Char delimiter, ch;
-  if (!src.next(delimiter)) return {kDestTooSmall, 0};
+  if (!src.next(delimiter)) return {kTooSmall, 0};
   int64_t last = -1;
   for (Reader<C> scan = src; scan.next(ch);) last = ch.p - a.src.p;
-  if (last < 0) return {kDestTooSmall, 0};
+  if (last < 0) return {kTooSmall, 0};
   src.end = last;  // the closing delimiter is dropped
   Writer<C> w(c, out, room, dbl);
   while (src.next(ch)) {

@@ -30,7 +30,7 @@ Result squeeze(const C &c, const SqueezeArgs &a, uint8_t *out, int64_t room, boo
       Char next;
       if (peek.next(next) && same(next, target)) continue;
     }
-    if (!w.put(ch)) return {kDestTooSmall, w.finish()};
+    if (!w.put(ch)) return {kTooSmall, w.finish()};
   }
   return {kOk, w.finish()};
 }

@@ -13,14 +13,10 @@
 #include <cstring>
 
 #include "cursor/char_model.hpp"
+#include "edit/statuses.hpp"
 #include "module/out_value.hpp"
 
 namespace nlssm::edit {
-
-inline constexpr int64_t kOk = 0;
-inline constexpr int64_t kTooSmall = NLSSM_E_DEST_TOO_SMALL;
-inline constexpr int64_t kNullArgument = NLSSM_E_NULL_ARGUMENT;
-inline constexpr int64_t kNoMemory = NLSSM_E_NO_MEMORY;
 
 using module::store;
 
@@ -183,7 +179,7 @@ struct Blank {
   uint8_t bytes[4];
   int64_t width;
   explicit Blank(const NLSSMHandle *h) {
-    width = h->blankWidth == 2 || h->blankWidth == 4 ? static_cast<int64_t>(h->blankWidth) : 1;
+    width = cursor::blank_width(h);
     std::memcpy(bytes, h->blankChar, 4);
   }
   Blank(uint8_t byte) : bytes{byte}, width(1) {}

@@ -38,7 +38,7 @@ Result transliterate_bytes(const TranslitArgs &a, int64_t pairs, uint8_t *out, i
   if (a.n > 0 && a.n < count) count = a.n;
   const int64_t done = count < room ? count : room;
   casecmp::map_bytes(map, a.src.p, out, done);
-  return {count > room ? kDestTooSmall : kOk, done};
+  return {count > room ? kTooSmall : kOk, done};
 }
 
 // The pairs in effect, the first kCached of them read once into arrays, the
@@ -129,12 +129,12 @@ Result transliterate(const C &c, const TranslitArgs &a, uint8_t *out, int64_t ro
                              src.p + src.off, w.claim(take), take);
           src.off += take;
           if (left > 0) left -= take;
-          if (src.off < run) return {kDestTooSmall, w.finish()};
+          if (src.off < run) return {kTooSmall, w.finish()};
           continue;
         }
       }
       if (!src.next(ch)) break;
-      if (!w.put(table.map(ch))) return {kDestTooSmall, w.finish()};
+      if (!w.put(table.map(ch))) return {kTooSmall, w.finish()};
       if (left > 0) --left;
     }
     return {kOk, w.finish()};

@@ -70,10 +70,10 @@ int64_t tranword_walk(const C &c, const TranwordArgs &a, int64_t findCount, Writ
     const Reader<C> at = src;
     if (!src.next(ch)) break;
     if (first.size != 0 && same(ch, first) && rest_matches(c, a.find, src)) {
-      if (!replace(c, a, findCount, src, at, w, left)) return kDestTooSmall;
+      if (!replace(c, a, findCount, src, at, w, left)) return kTooSmall;
       continue;
     }
-    if (!w.put(ch)) return kDestTooSmall;
+    if (!w.put(ch)) return kTooSmall;
     --left;
   }
   return kOk;
@@ -113,12 +113,12 @@ int64_t tranword_scan(const C &c, const TranwordArgs &a, int64_t findCount, Writ
   while (left > 0 && start < end) {
     const int64_t stop = C::kBytes && left < end - start ? start + left : end;
     // The next place the word's bytes stand, starting before stop.
-    const int64_t h = fl == 0 || pos >= stop
-                          ? -1
-                          : casecmp::simd::find_bytes(p, std::min(end, stop + fl - 1), a.find.p,
-                                                      fl, 1, pos);
+    const int64_t h =
+        fl == 0 || pos >= stop
+            ? -1
+            : casecmp::simd::find_bytes(p, std::min(end, stop + fl - 1), a.find.p, fl, 1, pos);
     if (h < 0) {
-      if (!flush(stop)) return kDestTooSmall;
+      if (!flush(stop)) return kTooSmall;
       break;
     }
     pos = h + 1;
@@ -128,8 +128,8 @@ int64_t tranword_scan(const C &c, const TranwordArgs &a, int64_t findCount, Writ
     Reader<C> at = src;
     at.off = h;
     src.off = h + fl;
-    if (!flush(h)) return kDestTooSmall;
-    if (!replace(c, a, findCount, src, at, w, left)) return kDestTooSmall;
+    if (!flush(h)) return kTooSmall;
+    if (!replace(c, a, findCount, src, at, w, left)) return kTooSmall;
     start = pos = src.off;
   }
   return kOk;
