@@ -11,6 +11,7 @@
 #include <cstring>
 
 #include "cursor/char_model.hpp"
+#include "edit/character_walk.hpp"
 #include "edit/statuses.hpp"
 #include "module/literal.hpp"
 #include "module/out_value.hpp"
@@ -340,34 +341,6 @@ inline bool overlaps(const uint8_t *a, uint64_t an, const uint8_t *b, uint64_t b
 }
 
 using module::store;
-
-using SetPosFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t);
-
-// A descriptor over text at its start: character 0 current, positioned
-// through the handle's stringSetPos (except four-byte text, whose first
-// character needs no walk).
-inline void position_at_start(const NLSSMHandle *h, NLSString &d) {
-  const auto length = static_cast<int64_t>(d.length);
-  d.charIndex = 0;
-  d.curOffset = length == 0 ? cursor::kNone : 0;
-  if (h->encodingClass == NLSSM_CLASS_SBCS) return;
-  d.nextOffset = static_cast<int64_t>(h->unitWidth) >= length ? cursor::kNone
-                                                              : static_cast<int64_t>(h->unitWidth);
-  d.prevOffset = cursor::kNoPrevious;
-  d.charKind = d.nextCharKind = d.prevKind = 0;
-  if (h->encodingClass != NLSSM_CLASS_WCS4 && length != 0 && h->stringSetPos != nullptr)
-    reinterpret_cast<SetPosFn>(h->stringSetPos)(h, &d, 0, 0);
-}
-
-inline NLSString descriptor_over(const NLSSMHandle *h, const uint8_t *text, uint64_t length,
-                                 uint64_t capacity) {
-  NLSString d{};
-  d.buffer = const_cast<uint8_t *>(text);
-  d.length = length;
-  d.capacity = capacity;
-  position_at_start(h, d);
-  return d;
-}
 
 // Runs `write(span, out, room, dbl) -> Result` into a descriptor: from its
 // current character (its start when unset), then the destination update:

@@ -237,7 +237,6 @@ bool literal_list(const NLSSMHandle *h, Literal &lit, const uint8_t *literal, in
 using DeleteFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, const NLSString *, int64_t,
                              int64_t);
 using DeleteSFn = int64_t (*)(const NLSSMHandle *, uint8_t *, int64_t, const uint8_t *, int64_t);
-using SetPosFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t);
 
 }  // namespace
 }  // namespace nlssm::edit
@@ -334,21 +333,8 @@ int64_t NLSStringDeleteLit(const NLSSMHandle *h, NLSString *target, int64_t n,
   ConvertedLiteral<256> lit;
   int64_t length = 0;
   if (!literal_list(h, lit, literal, literalBytes, length)) return NLSSM_COUNT_NO_MEMORY;
-  NLSString list{const_cast<uint8_t *>(lit.text()),
-                 static_cast<uint64_t>(length),
-                 static_cast<uint64_t>(length),
-                 0,
-                 length == 0 ? kUnset : 0,
-                 kUnset,
-                 NLSSM_POS_NO_PREVIOUS,
-                 0,
-                 0,
-                 0};
-  if (h->encodingClass != NLSSM_CLASS_SBCS) {
-    list.nextOffset = h->unitWidth == static_cast<uint64_t>(length) ? kUnset : h->unitWidth;
-    if (h->encodingClass != NLSSM_CLASS_WCS4 && length != 0 && h->stringSetPos != nullptr)
-      reinterpret_cast<SetPosFn>(h->stringSetPos)(h, &list, 0, 0);
-  }
+  NLSString list =
+      descriptor_over(h, lit.text(), static_cast<uint64_t>(length), static_cast<uint64_t>(length));
   if (h->NLSStringDelete == nullptr) return 0;
   return reinterpret_cast<DeleteFn>(h->NLSStringDelete)(h, target, n, &list, 0, flags);
 }

@@ -16,7 +16,6 @@ namespace {
 
 using MoveSFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, uint8_t *, int64_t,
                             int64_t *, int64_t);
-using SetPosFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t);
 
 struct Copy {
   int64_t offset;  // where the destination is written
@@ -249,19 +248,6 @@ ModalCopy copy_modal(const NLSSMHandle *h, const NLSString *src, NLSString *dst,
   return {{dstOff, bytes, truncated ? NLSSM_E_DEST_TOO_SMALL : NLSSM_OK}, join, chars, firstDbl};
 }
 
-// After the whole remaining source was copied: the destination is read
-// again from its first character.
-void restart_modal(const NLSSMHandle *h, NLSString *dst) {
-  const auto length = static_cast<int64_t>(dst->length);
-  dst->charIndex = 0;
-  dst->curOffset = length == 0 ? kUnset : 0;
-  dst->nextOffset = h->unitWidth >= length ? kUnset : h->unitWidth;
-  dst->prevOffset = NLSSM_POS_NO_PREVIOUS;
-  dst->charKind = dst->nextCharKind = dst->prevKind = 0;
-  if (length != 0 && h->stringSetPos != nullptr)
-    reinterpret_cast<SetPosFn>(h->stringSetPos)(h, dst, 0, 0);
-}
-
 int64_t substr_modal(const NLSSMHandle *h, const NLSString *src, NLSString *dst, int64_t n,
                      int64_t *count, int64_t flags) {
   if (unusable(src, dst)) return reject(src, dst, count);
@@ -276,14 +262,14 @@ int64_t substr_modal(const NLSSMHandle *h, const NLSString *src, NLSString *dst,
       !modal_double_at(m, dst->buffer, std::min(dstOff, static_cast<int64_t>(dst->capacity)))) {
     Copy c;
     move_rest(h, r, dst, dstOff, flags, c);
-    if (c.status == 0) restart_modal(h, dst);
+    if (c.status == 0) position_at_start(h, *dst);  // read again from its start
     store(count, c.bytes);
     return c.status;
   }
   const ModalCopy mc = copy_modal(h, src, dst, dstOff, n);
   finish_copy(h, dst, mc.copy, flags, 1);
   if (n <= 0 && mc.copy.status == 0) {
-    restart_modal(h, dst);
+    position_at_start(h, *dst);
   } else if (mc.chars > 0) {
     if (dst->curOffset < 0 && dstOff == 0) dst->charIndex = 0;
     dst->curOffset = dstOff + mc.join;
