@@ -195,15 +195,15 @@ struct ModalCopy {
   bool firstDbl;
 };
 
+// `srcDbl` and `dstDbl`: the shift states where the copy starts reading and
+// writing.
 ModalCopy copy_modal(const NLSSMHandle *h, const NLSString *src, NLSString *dst, int64_t dstOff,
-                     int64_t n) {
+                     int64_t n, bool srcDbl, bool dstDbl) {
   const ModalModel m(h);
   const int64_t room = room_at(dst, dstOff);
   const auto srcLength = static_cast<int64_t>(src->length);
   const int64_t from = std::min(src->curOffset, srcLength);
-  const bool dstDbl =
-      modal_double_at(m, dst->buffer, std::min(dstOff, static_cast<int64_t>(dst->capacity)));
-  ModalWalk walk(m, src->buffer, from, srcLength, modal_double_at(m, src->buffer, from));
+  ModalWalk walk(m, src->buffer, from, srcLength, srcDbl);
   ModalItem item;
   int64_t start = -1, end = 0, runStart = -1, join = 0, chars = 0;
   bool firstDbl = false, endDbl = false, truncated = false;
@@ -257,16 +257,17 @@ int64_t substr_modal(const NLSSMHandle *h, const NLSString *src, NLSString *dst,
   // The whole rest goes to the move when both sides are in single-byte
   // width where they meet; otherwise it is copied character by character
   // so that the join gets its shift sequence.
-  const int64_t srcAt = r.text - src->buffer;
-  if (n <= 0 && !modal_double_at(m, src->buffer, srcAt) &&
-      !modal_double_at(m, dst->buffer, std::min(dstOff, static_cast<int64_t>(dst->capacity)))) {
+  const bool srcDbl = modal_double_at(m, src->buffer, r.text - src->buffer);
+  const bool dstDbl =
+      modal_double_at(m, dst->buffer, std::min(dstOff, static_cast<int64_t>(dst->capacity)));
+  if (n <= 0 && !srcDbl && !dstDbl) {
     Copy c;
     move_rest(h, r, dst, dstOff, flags, c);
     if (c.status == 0) position_at_start(h, *dst);  // read again from its start
     store(count, c.bytes);
     return c.status;
   }
-  const ModalCopy mc = copy_modal(h, src, dst, dstOff, n);
+  const ModalCopy mc = copy_modal(h, src, dst, dstOff, n, srcDbl, dstDbl);
   finish_copy(h, dst, mc.copy, flags, 1);
   if (n <= 0 && mc.copy.status == 0) {
     position_at_start(h, *dst);
