@@ -70,6 +70,27 @@ std::string Arguments::option(const std::string &name, const std::string &fallba
   return found == options.end() ? fallback : found->second;
 }
 
+int64_t Arguments::number(const std::string &name, int64_t fallback) const {
+  if (!has(name)) return fallback;
+  try {
+    return std::stoll(option(name), nullptr, 0);
+  } catch (const std::exception &) {
+    throw Failure("--" + name + " takes a number");
+  }
+}
+
+NLSString descriptor(const NLSSMHandle *handle, std::vector<uint8_t> &bytes, int64_t start) {
+  NLSString s{};
+  s.buffer = bytes.data();
+  s.length = s.capacity = bytes.size();
+  s.curOffset = bytes.empty() ? NLSSM_POS_NONE : 0;
+  s.nextOffset = NLSSM_POS_NONE;
+  s.prevOffset = NLSSM_POS_NO_PREVIOUS;
+  using SetPos = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t);
+  if (!bytes.empty()) call<SetPos>(handle, handle->stringSetPos, &s, start, int64_t{0});
+  return s;
+}
+
 Session::Session() : host_(nlssm::refhost::ReferenceHost::start(nlssm::refhost::linked_module())) {
   if (host_->module() == nullptr) throw Failure("the module could not be started");
 }
@@ -164,18 +185,19 @@ std::vector<uint8_t> Session::convert(int64_t from, int64_t to,
   return out;
 }
 
+std::vector<uint8_t> Session::encoded(const NLSSMHandle *handle, const std::string &utf8) {
+  // Verbs convert their words again for every record: keep the last few.
+  const auto key = std::make_pair(static_cast<int64_t>(handle->encodingNumber), utf8);
+  const auto known = texts_.find(key);
+  if (known != texts_.end()) return known->second;
+  std::vector<uint8_t> text = convert(NLSSM_ENC_UTF8, handle->encodingNumber,
+                                      std::vector<uint8_t>(utf8.begin(), utf8.end()));
+  if (texts_.size() < 64 && utf8.size() < 4096) texts_.emplace(key, text);
+  return text;
+}
+
 std::vector<uint8_t> Session::input(const NLSSMHandle *handle, const Arguments &args) {
-  if (args.has("text")) {
-    // Verbs convert their words again for every record: keep the last few.
-    const std::string &utf8 = args.options.at("text");
-    const auto key = std::make_pair(static_cast<int64_t>(handle->encodingNumber), utf8);
-    const auto known = texts_.find(key);
-    if (known != texts_.end()) return known->second;
-    std::vector<uint8_t> text = convert(NLSSM_ENC_UTF8, handle->encodingNumber,
-                                        std::vector<uint8_t>(utf8.begin(), utf8.end()));
-    if (texts_.size() < 64 && utf8.size() < 4096) texts_.emplace(key, text);
-    return text;
-  }
+  if (args.has("text")) return encoded(handle, args.options.at("text"));
   if (args.has("hex")) return parse_hex(args.options.at("hex"));
   if (stream_ == nullptr) {
     int fd = STDIN_FILENO;

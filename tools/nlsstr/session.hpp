@@ -51,6 +51,8 @@ struct Arguments {
   std::map<std::string, std::string> options;
   bool has(const std::string &name) const { return options.count(name) != 0; }
   std::string option(const std::string &name, const std::string &fallback = "") const;
+  // A numeric option (decimal, 0x hexadecimal or 0 octal), else `fallback`.
+  int64_t number(const std::string &name, int64_t fallback = 0) const;
 };
 
 // How a verb can take a long text.
@@ -91,6 +93,8 @@ class Session {
   // The input text in the handle's encoding: --text (UTF-8, converted),
   // --hex, or the next text of --file or standard input (bytes as they are).
   std::vector<uint8_t> input(const NLSSMHandle *handle, const Arguments &args);
+  // A UTF-8 text of the command line in the handle's encoding.
+  std::vector<uint8_t> encoded(const NLSSMHandle *handle, const std::string &utf8);
   // Writes text of the handle's encoding in the form --out asks for.
   void print_text(const NLSSMHandle *handle, const std::vector<uint8_t> &text,
                   OutputForm form) const;
@@ -120,6 +124,9 @@ auto call(const NLSSMHandle *handle, NLSSlot slot, Args... args) {
   if (slot == nullptr) throw Failure("this encoding has no such operation", NLSSM_E_UNSUPPORTED);
   return reinterpret_cast<Fn>(slot)(handle, args...);
 }
+
+// A descriptor over `bytes`, on character `start` (unset when empty).
+NLSString descriptor(const NLSSMHandle *handle, std::vector<uint8_t> &bytes, int64_t start = 0);
 
 std::string hex(const uint8_t *bytes, size_t length);
 

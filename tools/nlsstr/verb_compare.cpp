@@ -24,11 +24,8 @@ Pair operands(Session &session, const Arguments &args, const std::string &verb) 
   if (args.words.size() != 3) throw Failure(verb + " takes an encoding and two texts");
   Pair pair{
       session.handle(args.words[0]), {}, {}, std::stoll(args.option("options", "0"), nullptr, 0)};
-  for (int k : {1, 2}) {
-    Arguments text;
-    text.options["text"] = args.words[static_cast<size_t>(k)];
-    (k == 1 ? pair.first : pair.second) = session.input(pair.handle, text);
-  }
+  pair.first = session.encoded(pair.handle, args.words[1]);
+  pair.second = session.encoded(pair.handle, args.words[2]);
   return pair;
 }
 

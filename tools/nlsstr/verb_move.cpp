@@ -21,15 +21,6 @@ using NumCharsS = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, int
 using AddQuotesS = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, uint8_t *, int64_t,
                                int64_t *);
 
-int64_t number(const Arguments &args, const std::string &name, int64_t fallback) {
-  if (!args.has(name)) return fallback;
-  try {
-    return std::stoll(args.option(name), nullptr, 0);
-  } catch (const std::exception &) {
-    throw Failure("--" + name + " takes a number");
-  }
-}
-
 const NLSSMHandle *one_encoding(Session &session, const Arguments &args, const char *verb) {
   if (args.words.empty()) throw Failure(std::string(verb) + " takes an encoding");
   return session.handle(args.words[0]);
@@ -57,20 +48,20 @@ int finish(Session &session, const NLSSMHandle *h, const Arguments &args, int64_
 int move(Session &session, const Arguments &args) {
   const NLSSMHandle *h = one_encoding(session, args, "move");
   const std::vector<uint8_t> text = session.input(h, args);
-  const int64_t room = number(args, "room", static_cast<int64_t>(text.size()));
+  const int64_t room = args.number("room", static_cast<int64_t>(text.size()));
   if (room < 0) throw Failure("--room must not be negative");
   std::vector<uint8_t> dst(static_cast<size_t>(room));
   int64_t bytes = 0, chars = 0;
   const int64_t status =
       call<MoveC>(h, h->NLSStringMoveC, text.data(), static_cast<int64_t>(text.size()), dst.data(),
-                  room, &bytes, &chars, static_cast<uint32_t>(number(args, "flags", 0)));
+                  room, &bytes, &chars, static_cast<uint32_t>(args.number("flags", 0)));
   return finish(session, h, args, status, {{"bytes", bytes}, {"characters", chars}}, dst);
 }
 
 int fill(Session &session, const Arguments &args) {
   const NLSSMHandle *h = one_encoding(session, args, "fill");
   const std::string ch = args.option("char", " ");
-  const int64_t room = number(args, "room", 8);
+  const int64_t room = args.number("room", 8);
   if (room < 0) throw Failure("--room must not be negative");
   std::vector<uint8_t> dst(static_cast<size_t>(room));
   int64_t written = 0;
@@ -85,14 +76,11 @@ int fill(Session &session, const Arguments &args) {
 int concat(Session &session, const Arguments &args) {
   const NLSSMHandle *h = one_encoding(session, args, "concat");
   std::vector<std::vector<uint8_t>> pieces;
-  for (size_t i = 1; i < args.words.size(); ++i) {
-    Arguments text;
-    text.options["text"] = args.words[i];
-    pieces.push_back(session.input(h, text));
-  }
+  for (size_t i = 1; i < args.words.size(); ++i)
+    pieces.push_back(session.encoded(h, args.words[i]));
   if (pieces.size() > 8) throw Failure("concat takes at most eight pieces");
   pieces.resize(8);
-  const int64_t length = number(args, "room", 32);
+  const int64_t length = args.number("room", 32);
   const int64_t room = length < 0 ? -length : length;
   std::vector<uint8_t> dst(static_cast<size_t>(room));
   const std::string sep = args.option("sep", "");
@@ -102,7 +90,7 @@ int concat(Session &session, const Arguments &args) {
   const int64_t status = call<ConcatS>(
       h, h->NLSStringConcatS, dst.data(), length, &written,
       reinterpret_cast<const uint8_t *>(sep.data()), static_cast<int64_t>(sep.size()),
-      static_cast<uint32_t>(number(args, "flags", 0)), static_cast<int64_t>(args.words.size() - 1),
+      static_cast<uint32_t>(args.number("flags", 0)), static_cast<int64_t>(args.words.size() - 1),
       piece(0), size(0), piece(1), size(1), piece(2), size(2), piece(3), size(3), piece(4), size(4),
       piece(5), size(5), piece(6), size(6), piece(7), size(7));
   if (length < 0) dst.resize(static_cast<size_t>(written));  // the text before its zero byte
@@ -134,7 +122,7 @@ int quote(Session &session, const Arguments &args) {
   const NLSSMHandle *h = one_encoding(session, args, "quote");
   const std::vector<uint8_t> text = session.input(h, args);
   const int64_t room =
-      number(args, "room", 2 * static_cast<int64_t>(text.size()) + 2 * h->quoteWidth);
+      args.number("room", 2 * static_cast<int64_t>(text.size()) + 2 * h->quoteWidth);
   if (room < 0) throw Failure("--room must not be negative");
   std::vector<uint8_t> dst(static_cast<size_t>(room));
   int64_t result = 0;

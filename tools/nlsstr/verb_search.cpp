@@ -8,27 +8,7 @@
 namespace nlsstr {
 namespace {
 
-using SetPos = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t);
 using Next = int64_t (*)(const NLSSMHandle *, NLSString *);
-
-// A UTF-8 word of the command line in the handle's encoding.
-std::vector<uint8_t> word_in(Session &session, const NLSSMHandle *h, const std::string &word) {
-  Arguments a;
-  a.options["text"] = word;
-  return session.input(h, a);
-}
-
-// A descriptor on the first character of `bytes`.
-NLSString on_first(const NLSSMHandle *h, std::vector<uint8_t> &bytes) {
-  NLSString s{};
-  s.buffer = bytes.data();
-  s.length = s.capacity = bytes.size();
-  s.curOffset = bytes.empty() ? NLSSM_POS_NONE : 0;
-  s.nextOffset = NLSSM_POS_NONE;
-  s.prevOffset = NLSSM_POS_NO_PREVIOUS;
-  if (!bytes.empty()) call<SetPos>(h, h->stringSetPos, &s, int64_t{0}, int64_t{0});
-  return s;
-}
 
 struct Operands {
   const NLSSMHandle *h;
@@ -40,7 +20,7 @@ Operands operands(Session &session, const Arguments &args, const char *verb) {
   Operands o;
   o.h = session.handle(args.words[0]);
   o.text = session.input(o.h, args);
-  o.other = word_in(session, o.h, args.words[1]);
+  o.other = session.encoded(o.h, args.words[1]);
   return o;
 }
 
@@ -53,7 +33,7 @@ void print_position(int64_t r) {
 
 int index(Session &session, const Arguments &args) {
   Operands o = operands(session, args, "index");
-  NLSString s = on_first(o.h, o.text), p = on_first(o.h, o.other);
+  NLSString s = descriptor(o.h, o.text), p = descriptor(o.h, o.other);
   using Fn = int64_t (*)(const NLSSMHandle *, const NLSString *, const NLSString *, int64_t);
   print_position(call<Fn>(o.h, o.h->NLSStringIndex, &s, &p, int64_t{0}));
   return 0;
@@ -61,7 +41,7 @@ int index(Session &session, const Arguments &args) {
 
 int verify(Session &session, const Arguments &args) {
   Operands o = operands(session, args, "verify");
-  NLSString s = on_first(o.h, o.text), set = on_first(o.h, o.other);
+  NLSString s = descriptor(o.h, o.text), set = descriptor(o.h, o.other);
   using Fn =
       int64_t (*)(const NLSSMHandle *, const NLSString *, int64_t, const NLSString *, int64_t);
   print_position(call<Fn>(o.h, o.h->NLSStringVerify, &s, int64_t{0}, &set, int64_t{0}));
@@ -70,7 +50,7 @@ int verify(Session &session, const Arguments &args) {
 
 int like(Session &session, const Arguments &args) {
   Operands o = operands(session, args, "like");
-  NLSString s = on_first(o.h, o.text), p = on_first(o.h, o.other);
+  NLSString s = descriptor(o.h, o.text), p = descriptor(o.h, o.other);
   using Fn = int64_t (*)(const NLSSMHandle *, const NLSString *, const NLSString *, int64_t);
   const int64_t r =
       call<Fn>(o.h, o.h->NLSStringLike, &s, &p, int64_t{args.option("escape", "0") != "0"});
@@ -105,7 +85,7 @@ int is(Session &session, const Arguments &args) {
     throw Failure("classes: upper lower alpha digit space punct blank control xdigit graph");
   const NLSSMHandle *h = session.handle(args.words[0]);
   std::vector<uint8_t> text = session.input(h, args);
-  NLSString s = on_first(h, text);
+  NLSString s = descriptor(h, text);
   const ClassQuery q = found->second;
   // Unicode space tests take a strict flag instead of a mask.
   const bool strict_form =

@@ -7,7 +7,6 @@
 namespace nlsstr {
 namespace {
 
-using SetPosFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, int64_t);
 using SubStrFn = int64_t (*)(const NLSSMHandle *, const NLSString *, NLSString *, int64_t,
                              int64_t *, int64_t);
 using DeleteFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, const NLSString *, int64_t,
@@ -15,23 +14,6 @@ using DeleteFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t, const NL
 using ReverseFn = int64_t (*)(const NLSSMHandle *, NLSString *, int64_t);
 using StripFn = int64_t (*)(const NLSSMHandle *, const NLSString *, int64_t, int64_t);
 using StripSFn = int64_t (*)(const NLSSMHandle *, const uint8_t *, int64_t, int64_t);
-
-int64_t number(const Arguments &args, const std::string &name, int64_t fallback = 0) {
-  const std::string value = args.option(name, std::to_string(fallback));
-  try {
-    return std::stoll(value, nullptr, 0);
-  } catch (const std::exception &) {
-    throw Failure("--" + name + " takes a number");
-  }
-}
-
-// A descriptor over text[0, length) in a buffer of `capacity` bytes, at
-// character `start` (unset when the text has no such character).
-NLSString at(const NLSSMHandle *h, std::vector<uint8_t> &text, size_t length, int64_t start) {
-  NLSString s{text.data(), length, text.size(), 0, length == 0 ? -9 : 0, -9, -1, 0, 0, 0};
-  if (length != 0) call<SetPosFn>(h, h->stringSetPos, &s, start, int64_t{0});
-  return s;
-}
 
 std::vector<uint8_t> head(const std::vector<uint8_t> &text, uint64_t length) {
   return {text.begin(), text.begin() + static_cast<ptrdiff_t>(length)};
@@ -41,13 +23,13 @@ int substr(Session &session, const Arguments &args) {
   if (args.words.size() != 1) throw Failure("substr takes one encoding");
   const NLSSMHandle *h = session.handle(args.words[0]);
   std::vector<uint8_t> text = session.input(h, args);
-  const NLSString source = at(h, text, text.size(), number(args, "start"));
+  const NLSString source = descriptor(h, text, args.number("start"));
   std::vector<uint8_t> out(
-      static_cast<size_t>(number(args, "room", static_cast<int64_t>(text.size()))));
+      static_cast<size_t>(args.number("room", static_cast<int64_t>(text.size()))));
   NLSString destination{out.data(), 0, out.size(), 0, -9, -9, -1, 0, 0, 0};
   int64_t copied = 0;
   const int64_t status = call<SubStrFn>(h, h->NLSStringSubStr, &source, &destination,
-                                        number(args, "count"), &copied, number(args, "flags"));
+                                        args.number("count"), &copied, args.number("flags"));
   session.print_text(h, head(out, destination.length), Session::output_form(args));
   std::cerr << "copied " << copied << " bytes\n";
   check(status, "taking the substring");
@@ -58,12 +40,10 @@ int delete_chars(Session &session, const Arguments &args) {
   if (args.words.size() != 2) throw Failure("delete takes an encoding and a character list");
   const NLSSMHandle *h = session.handle(args.words[0]);
   std::vector<uint8_t> text = session.input(h, args);
-  Arguments listText;
-  listText.options["text"] = args.words[1];
-  std::vector<uint8_t> list = session.input(h, listText);
-  NLSString target = at(h, text, text.size(), number(args, "start"));
-  const NLSString chars = at(h, list, list.size(), 0);
-  const int64_t kept = call<DeleteFn>(h, h->NLSStringDelete, &target, number(args, "count"), &chars,
+  std::vector<uint8_t> list = session.encoded(h, args.words[1]);
+  NLSString target = descriptor(h, text, args.number("start"));
+  const NLSString chars = descriptor(h, list, 0);
+  const int64_t kept = call<DeleteFn>(h, h->NLSStringDelete, &target, args.number("count"), &chars,
                                       int64_t{0}, int64_t{0});
   if (kept == NLSSM_COUNT_NO_MEMORY) throw Failure("deleting", NLSSM_E_NO_MEMORY);
   session.print_text(h, text, Session::output_form(args));
@@ -75,8 +55,8 @@ int reverse(Session &session, const Arguments &args) {
   if (args.words.size() != 1) throw Failure("reverse takes one encoding");
   const NLSSMHandle *h = session.handle(args.words[0]);
   std::vector<uint8_t> text = session.input(h, args);
-  NLSString s = at(h, text, text.size(), number(args, "start"));
-  check(call<ReverseFn>(h, h->NLSStringReverse, &s, number(args, "count")), "reversing");
+  NLSString s = descriptor(h, text, args.number("start"));
+  check(call<ReverseFn>(h, h->NLSStringReverse, &s, args.number("count")), "reversing");
   session.print_text(h, text, Session::output_form(args));
   return 0;
 }
@@ -85,9 +65,9 @@ int strip(Session &session, const Arguments &args) {
   if (args.words.size() != 1) throw Failure("strip takes one encoding");
   const NLSSMHandle *h = session.handle(args.words[0]);
   std::vector<uint8_t> text = session.input(h, args);
-  const int64_t flags = number(args, "flags");
-  const NLSString s = at(h, text, text.size(), number(args, "start"));
-  const int64_t chars = call<StripFn>(h, h->NLSStringStrip, &s, number(args, "count"), flags);
+  const int64_t flags = args.number("flags");
+  const NLSString s = descriptor(h, text, args.number("start"));
+  const int64_t chars = call<StripFn>(h, h->NLSStringStrip, &s, args.number("count"), flags);
   const int64_t bytes =
       call<StripSFn>(h, h->NLSStringStripS, text.data(), static_cast<int64_t>(text.size()), flags);
   std::cout << "characters " << chars << "\nbytes      " << bytes << '\n';

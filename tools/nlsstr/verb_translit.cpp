@@ -39,9 +39,7 @@ struct Job {
   }
   // An option's UTF-8 text in the handle's encoding.
   std::vector<uint8_t> word(Session &session, const Arguments &args, const std::string &name) {
-    Arguments text_only;
-    text_only.options["text"] = args.option(name);
-    return session.input(handle, text_only);
+    return session.encoded(handle, args.option(name));
   }
   int64_t room() const { return static_cast<int64_t>(out.size()); }
   int finish(Session &session, const Arguments &args, int64_t status, int64_t written,
