@@ -104,19 +104,12 @@ Boundaries::Cut Boundaries::cut(const uint8_t *p, size_t limit, size_t available
 size_t Boundaries::newline(const uint8_t *p, size_t available, size_t &width) const {
   width = 1;
   switch (h_->encodingClass) {
-    case NLSSM_CLASS_WCS2: {
-      width = 2;
-      const bool big = nlssm::edit::wide_big_endian(h_);
-      const uint8_t unit[2] = {static_cast<uint8_t>(big ? 0 : 0x0A),
-                               static_cast<uint8_t>(big ? 0x0A : 0)};
-      return find_unit(p, available, unit, 2);
-    }
+    case NLSSM_CLASS_WCS2:
     case NLSSM_CLASS_WCS4: {
-      width = 4;
-      const bool big = nlssm::edit::wide_big_endian(h_);
-      const uint8_t unit[4] = {static_cast<uint8_t>(big ? 0 : 0x0A), 0, 0,
-                               static_cast<uint8_t>(big ? 0x0A : 0)};
-      return find_unit(p, available, unit, 4);
+      width = h_->encodingClass == NLSSM_CLASS_WCS2 ? 2 : 4;
+      uint8_t unit[4] = {};
+      unit[nlssm::edit::wide_big_endian(h_) ? width - 1 : 0] = 0x0A;
+      return find_unit(p, available, unit, width);
     }
     default:
       break;
@@ -219,10 +212,7 @@ void Stream::cut_into(std::vector<uint8_t> &text, size_t limit, bool prefer_sing
 }
 
 std::vector<uint8_t> Stream::next(const NLSSMHandle *h) {
-  if (handle_ == nullptr) {
-    handle_ = h;
-    boundaries_ = std::make_unique<Boundaries>(h);
-  }
+  if (boundaries_ == nullptr) boundaries_ = std::make_unique<Boundaries>(h);
   ++count_;
   taken_ = 1;
   switch (split_) {

@@ -126,7 +126,6 @@ class Stream {
   size_t record_bytes_;
   bool batch_;
   Reader reader_;
-  const NLSSMHandle *handle_ = nullptr;
   std::unique_ptr<Boundaries> boundaries_;
   bool shifted_ = false;  // the next text continues a double-byte run
   int64_t count_ = 0;     // records and lines taken
